@@ -1,0 +1,23 @@
+#pragma once
+
+#include <cstdint>
+
+/// Attributes of a chain device and of the flash attached to it. Values are texts.
+namespace DeviceNS {
+
+enum ATTRIBUTE : std::int32_t {
+  UNKNOWN = -1,
+  NAME = 1,  ///< "unknown" for a device that a chain scan could not identify
+  STATE = 2,
+  CS_PIN = 3,
+  CONFIG_FILE_NAME = 4,  ///< setting it means assigning a file
+  IR_LENGTH = 18,
+  KEY = 25,
+  MPM_PAIR = 30,  ///< "true" on the fixed PROM part of an MPM pair
+  SPI_PART = 57,  ///< null when no SPI flash is attached
+  SPI_FILE = 58,
+  BPI_PART = 60,  ///< null when no BPI flash is attached
+  BPI_FILE = 61
+};
+
+}  // namespace DeviceNS

@@ -1,0 +1,75 @@
+#include "utility/CommandTable.h"
+
+#include <algorithm>
+#include <deque>
+#include <string>
+#include <unordered_map>
+
+#include "interfaces/portability/UT_STR.h"
+
+namespace CommandTable {
+namespace {
+
+std::string lowered(const char* word) {
+  std::string text = word;
+  for (char& character : text)
+    if (character >= 'A' && character <= 'Z') character = static_cast<char>(character + ('a' - 'A'));
+  return text;
+}
+
+class Index {
+ public:
+  static Index& instance() {
+    static Index index;
+    return index;
+  }
+
+  const std::vector<const Command*>& all() const { return sorted_; }
+
+  const Command* find(const char* word) const {
+    const auto place = byWord_.find(lowered(word));
+    return place == byWord_.end() ? nullptr : place->second;
+  }
+
+  void accept(const char* word) {
+    if (find(word) != nullptr) return;
+    acceptedWords_.emplace_back(word);
+    accepted_.push_back({acceptedWords_.back().c_str(), 0, "A word of the host.", {}, {}, ""});
+    add(accepted_.back());
+    sort();
+  }
+
+ private:
+  Index() {
+    for (const auto& family : {sessionCommands, settingsCommands, cableCommands, chainCommands, operationCommands,
+                               formatterCommands, projectCommands, converterCommands})
+      for (const Command& command : family) add(command);
+    sort();
+  }
+
+  void add(const Command& command) {
+    sorted_.push_back(&command);
+    const std::string word = lowered(command.word);
+    byWord_.emplace(word, &command);
+    for (std::size_t length = static_cast<std::size_t>(command.shortest); length > 0 && length < word.size(); ++length)
+      byWord_.emplace(word.substr(0, length), &command);
+  }
+
+  void sort() {
+    std::sort(sorted_.begin(), sorted_.end(),
+              [](const Command* a, const Command* b) { return UT_STR::ICompare(a->word, b->word) < 0; });
+  }
+
+  std::vector<const Command*> sorted_;
+  std::unordered_map<std::string, const Command*> byWord_;
+  std::deque<std::string> acceptedWords_;
+  std::deque<Command> accepted_;
+};
+
+}  // namespace
+
+const std::vector<const Command*>& all() { return Index::instance().all(); }
+const Command* find(const char* word) { return Index::instance().find(word); }
+void accept(const char* word) { Index::instance().accept(word); }
+
+}  // namespace CommandTable

@@ -1,0 +1,124 @@
+#include "interfaces/utility/TesselCmdargs.h"
+
+#include <string>
+
+#include "interfaces/portability/Port_MsgManData.h"
+#include "interfaces/portability/UT_STR.h"
+#include "utility/CommandTable.h"
+
+using namespace CommandTable;
+
+namespace {
+
+template <class... Arguments>
+[[noreturn]] void reject(const char* format, const Arguments&... arguments) {
+  const std::string text = Port::format(format, arguments...);
+  Port_MsgManData::createObject("tESSEL", "../s/TesselCmdargs", __LINE__, "").issueError("%s\n", text);
+  throw InvalidArgumentException(text);
+}
+
+const Switch* findSwitch(std::span<const Switch> switches, const char* name) {
+  for (const Switch& each : switches)
+    if (UT_STR::ICompare(each.name, name) == 0) return &each;
+  return nullptr;
+}
+
+const Switch* findSwitch(const Command& command, const char* name) {
+  const Switch* found = findSwitch(command.common, name);
+  return found != nullptr ? found : findSwitch(command.own, name);
+}
+
+std::string switchNames(const Command& command) {
+  std::string names;
+  for (const auto& switches : {command.common, command.own})
+    for (const Switch& each : switches) names += (names.empty() ? "" : " ") + std::string(each.name);
+  return names.empty() ? "no switches" : names;
+}
+
+/// A whole decimal number with or without a sign, of any size.
+bool isNumber(const char* text) {
+  if (*text == '-' || *text == '+') ++text;
+  if (*text == '\0') return false;
+  while (*text >= '0' && *text <= '9') ++text;
+  return *text == '\0';
+}
+
+bool wantsNumber(const Switch& row, int index) {
+  return row.kind == Kind::number || (row.kind == Kind::numberThenText && index == 0);
+}
+
+void checkSwitch(const Command& command, const Switch& row, const UT_CMDSWINFO& given) {
+  if (given.getnumargs() < row.least)
+    reject("Switch %s of %s needs its argument: %s. Try help -m %s.", given.getswname(), command.word, row.argument,
+           command.word);
+  if (given.getnumargs() > row.most)
+    reject("Unexpected word %s after switch %s of %s. Try help -m %s.", given.getargtxt(row.most), given.getswname(),
+           command.word, command.word);
+  for (int i = 0; i < given.getnumargs(); ++i)
+    if (wantsNumber(row, i) && !isNumber(given.getargtxt(i)))
+      reject("Switch %s of %s takes a number, not %s. Try help -m %s.", given.getswname(), command.word,
+             given.getargtxt(i), command.word);
+}
+
+void check(const Command& command, const UT_CMDARGS& given, const char* firstWord) {
+  // A command whose switch names are free takes one word after each of them.
+  static constexpr Switch freeSwitch = optionalText("", "", "");
+  if (command.switches == Switches::anything) return;
+  if (given.getnumargs() > 0)
+    reject("Unexpected word %s after %s: a switch begins with -. Try help -m %s.", firstWord, command.word,
+           command.word);
+  for (int i = 0; i < given.getnumsw(); ++i) {
+    const UT_CMDSWINFO& each = *given.getsw(i);
+    const Switch* row = command.switches == Switches::anyName ? &freeSwitch : findSwitch(command, each.getswname());
+    if (row == nullptr)
+      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", each.getswname(), command.word,
+             switchNames(command), command.word);
+    checkSwitch(command, *row, each);
+  }
+}
+
+std::string switchForm(const Switch& row) {
+  if (row.kind == Kind::flag) return row.name;
+  std::string argument = row.argument;
+  if (row.most == anyNumber) argument += "...";
+  return std::string(row.name) + " <" + argument + ">";
+}
+
+}  // namespace
+
+std::unique_ptr<UT_CMDARGS> TesselCmdargs::getCmdargs(int count, const char* const* words, bool check) {
+  auto given = std::make_unique<UT_CMDARGS>(count, words);
+  if (!check) return given;
+  const Command* command = CommandTable::find(given->getcmd());
+  if (command == nullptr) throw ACDEntryNotFoundException(given->getcmd());
+  ::check(*command, *given, given->getnumargs() > 0 ? words[1] : "");
+  return given;
+}
+
+std::vector<StringBase> TesselCmdargs::findAllCommands() { return findMatchingCommands(""); }
+
+std::vector<StringBase> TesselCmdargs::findMatchingCommands(const char* text) {
+  const std::string pattern = "*" + std::string(text) + "*";
+  std::vector<StringBase> words;
+  for (const Command* command : CommandTable::all())
+    if (UT_STR::IMatch(command->word, pattern.c_str())) words.emplace_back(command->word);
+  return words;
+}
+
+StringBase TesselCmdargs::findBatchFormatString(const char* word) {
+  const Command* command = CommandTable::find(word);
+  if (command == nullptr) return {};
+  std::string text = std::string(command->word) + ": " + command->meaning + "\n";
+  for (const auto& switches : {command->common, command->own})
+    for (const Switch& row : switches) {
+      std::string form = "  " + switchForm(row);
+      form.resize(std::max<std::size_t>(form.size() + 2, 26), ' ');
+      text += form + row.meaning + "\n";
+    }
+  text += command->note;
+  if (command->shortest > 0) text += Port::format("Short forms of %d letters and more do.\n", command->shortest);
+  if (*command->example != '\0') text += "Example: " + std::string(command->example);
+  return StringBase(text);
+}
+
+void TesselCmdargs::accept(const char* word) { CommandTable::accept(word); }

@@ -1,0 +1,78 @@
+#include "interfaces/utility/TesselPreference.h"
+
+#include <cstdio>
+
+#include "interfaces/portability/UT_STR.h"
+
+namespace {
+
+struct Row {
+  const char* name;
+  const char* initial;
+  const char* expected;
+  bool isNumber;
+};
+/// In the order of the enumeration.
+constexpr Row rows[TesselPreference::count] = {
+    {"lineWidth", "0", "a number of columns, 0 for no wrapping", true},
+    {"recordSteps", "true", "true or false", false},
+    {"cableLockTries", "1", "a number of tries, 1 or more", true},
+};
+
+const Row* rowOf(TesselPreference::PREFERENCE preference) {
+  return preference >= 0 && preference < TesselPreference::count ? &rows[preference] : nullptr;
+}
+
+bool accepts(const Row& row, const char* value) {
+  if (!row.isNumber) return UT_STR::ICompare(value, "true") == 0 || UT_STR::ICompare(value, "false") == 0;
+  if (*value == '\0') return false;
+  for (const char* digit = value; *digit != '\0'; ++digit)
+    if (*digit < '0' || *digit > '9') return false;
+  return true;
+}
+
+}  // namespace
+
+TesselPreference& TesselPreference::getPreferenceObject() {
+  static TesselPreference object;
+  return object;
+}
+
+TesselPreference::PREFERENCE TesselPreference::string2Pref(const char* name) {
+  for (int i = 0; i < count; ++i)
+    if (UT_STR::ICompare(rows[i].name, name) == 0) return static_cast<PREFERENCE>(i);
+  return unknown;
+}
+
+const char* TesselPreference::pref2String(PREFERENCE preference) {
+  const Row* row = rowOf(preference);
+  return row == nullptr ? "" : row->name;
+}
+
+const char* TesselPreference::expectedValue(PREFERENCE preference) {
+  const Row* row = rowOf(preference);
+  return row == nullptr ? "" : row->expected;
+}
+
+bool TesselPreference::set(PREFERENCE preference, const char* value) {
+  const Row* row = rowOf(preference);
+  if (row == nullptr || value == nullptr || !accepts(*row, value)) return false;
+  values_[static_cast<std::size_t>(preference)] = StringBase(value);
+  return true;
+}
+
+const char* TesselPreference::get(PREFERENCE preference) const {
+  const Row* row = rowOf(preference);
+  if (row == nullptr) return "";
+  const StringBase& value = values_[static_cast<std::size_t>(preference)];
+  return value.empty() ? row->initial : value.c_str();
+}
+
+int TesselPreference::getNumber(PREFERENCE preference) const { return UT_STR::AToI(get(preference)); }
+
+void TesselPreference::dump() const {
+  for (int i = 0; i < count; ++i) {
+    const StringBase& value = values_[static_cast<std::size_t>(i)];
+    if (!value.empty()) std::printf("Preference %s is %s\n", rows[i].name, value.c_str());
+  }
+}
