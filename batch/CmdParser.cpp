@@ -42,6 +42,7 @@ bool CmdParser::runCommandLine() {
   bool result = true;
   TesselPreference::getPreferenceObject().dump();
   LineBuffer line;
+  CommandSet command(0);
   while (!quitRequested) {
     Port::Console::print(">");
     if (!Port::Console::readLine(line.data(), lineBufferSize)) {
@@ -50,8 +51,8 @@ bool CmdParser::runCommandLine() {
     } else if (interruptRequested != 0) {
       quitRequested = true;
       Port::Console::print("QUIT.\n");
-    } else if (const auto command = recordAndTokenise(line.data())) {
-      const bool lineResult = processLine(*command);
+    } else if (recordAndTokenise(line.data(), command)) {
+      const bool lineResult = processLine(command);
       // The line that ends the session leaves the result of the one before it.
       if (!quitRequested) result = lineResult;
     }
@@ -69,8 +70,9 @@ bool CmdParser::runCommandFile(const char* path) {
   bool result = true;
   TesselPreference::getPreferenceObject().dump();
   LineBuffer line;
+  CommandSet command(0);
   while (!quitRequested && result && Port::Stream::readline(*commandFile, line.data(), lineBufferSize))
-    if (const auto command = recordAndTokenise(line.data())) result = processLine(*command);
+    if (recordAndTokenise(line.data(), command)) result = processLine(command);
   if (commandFile->error() != 0)
     result = Messages::failure("Read error in file %s: %s\n", path, std::strerror(commandFile->error()));
   if (result && inRepeat) {

@@ -75,8 +75,8 @@ class CmdParser {
   bool runRepeatLoop();
   /// Checks a line against the command table and reports what is wrong with it.
   bool parseCommand(std::unique_ptr<UT_CMDARGS>& parsed, CommandSet& line);
-  /// Puts a line into the transcript and splits it; null for a comment.
-  std::unique_ptr<CommandSet> recordAndTokenise(const char* line);
+  /// Puts a line into the transcript and splits it; false for a comment.
+  bool recordAndTokenise(const char* line, CommandSet& command);
   /// Runs a command: positions, external utilities, parsing, progress callback, handler.
   bool dispatch(CommandSet& line);
 

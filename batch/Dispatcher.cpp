@@ -1,5 +1,6 @@
 #include <algorithm>
 #include <array>
+#include <string_view>
 
 #include "batch/CmdParser.h"
 #include "batch/Interrupts.h"
@@ -18,7 +19,7 @@ using Action = bool (*)(CmdParser& session, UT_CMDARGS& args, CommandSet& line);
 enum class Match { wholeWord, twoLetters };
 
 struct Row {
-  const char* word;
+  std::string_view word;
   Match match;
   Action action;
 };
@@ -191,7 +192,8 @@ constexpr Row rows[] = {
     whole("verify", notBuilt),
 };
 
-constexpr char firstLetter(const char* word) {
+constexpr char firstLetter(std::string_view word) {
+  if (word.empty()) return '\0';
   return word[0] >= 'A' && word[0] <= 'Z' ? static_cast<char>(word[0] + ('a' - 'A')) : word[0];
 }
 
@@ -216,12 +218,17 @@ constexpr auto groups = [] {
   return made;
 }();
 
-bool matches(const Row& row, const char* word) {
-  if (row.match == Match::twoLetters) return UT_STR::INCompare(word, row.word, 2) == 0;
-  return UT_STR::ICompare(word, row.word) == 0;
+bool isWord(std::string_view word, std::string_view name) {
+  // Lengths first: most words of a group begin alike.
+  return word.size() == name.size() && UT_STR::ICompare(word.data(), name.data()) == 0;
 }
 
-const Row* findRow(const char* word) {
+bool matches(const Row& row, std::string_view word) {
+  if (row.match == Match::twoLetters) return UT_STR::INCompare(word.data(), row.word.data(), 2) == 0;
+  return isWord(word, row.word);
+}
+
+const Row* findRow(std::string_view word) {
   const char letter = firstLetter(word);
   if (letter < 'a' || letter > 'v') return nullptr;
   const Group& group = groups[static_cast<std::size_t>(letter - 'a')];
@@ -230,10 +237,10 @@ const Row* findRow(const char* word) {
 }
 
 /// Offers the words of the line to the external conversion utilities. True when one took it.
-bool convert(const CommandSet& line, bool& result) {
-  static constexpr const char* obaWords[] = {"svf2Oba", "qinterlv", "qmpm2svf", "qmselmap", "qmcslink", "q_compex"};
-  const char* word = line.getCommand(0);
-  const auto is = [word](const char* name) { return UT_STR::ICompare(word, name) == 0; };
+bool convert(std::string_view word, const CommandSet& line, bool& result) {
+  static constexpr std::string_view obaWords[] = {"svf2Oba",  "qinterlv", "qmpm2svf",
+                                                  "qmselmap", "qmcslink", "q_compex"};
+  const auto is = [word](std::string_view name) { return isWord(word, name); };
   const int count = line.getNumberCommands();
   if (std::any_of(std::begin(obaWords), std::end(obaWords), is))
     result = ObaInterface(count, line.getCommands());
@@ -257,15 +264,15 @@ void registerProgress(CmdParser& session, const UT_CMDARGS& args) {
 bool CmdParser::dispatch(CommandSet& line) {
   // The numbers of setCable are ports.
   if (UT_STR::ICompare(line.getCommand(0), "setcable") != 0 && !line.decrementPositions()) return false;
+  const std::string_view word = line.getCommand(0);
   bool converted = false;
-  if (convert(line, converted)) return converted;
+  if (convert(word, line, converted)) return converted;
   std::unique_ptr<UT_CMDARGS> args;
   if (!parseCommand(args, line)) return false;
   if (deviceManager == nullptr) return Messages::failure("There is no device manager.\n");
   registerProgress(*this, *args);
-  const char* word = line.getCommand(0);
   if (const Row* row = findRow(word)) return row->action(*this, *args, line);
   // Words that begin with F fail without a message; scripts rely on it.
   if (firstLetter(word) == 'f') return false;
-  return Messages::failure("Unknown operation %s\n", word);
+  return Messages::failure("Unknown operation %s\n", word.data());
 }

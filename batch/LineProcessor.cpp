@@ -88,10 +88,10 @@ bool CmdParser::parseCommand(std::unique_ptr<UT_CMDARGS>& parsed, CommandSet& li
   }
 }
 
-std::unique_ptr<CommandSet> CmdParser::recordAndTokenise(const char* line) {
+bool CmdParser::recordAndTokenise(const char* line, CommandSet& command) {
   commandText += line;
   commandText += '\n';
-  return CommandSet::string2CommandSet(line);
+  return CommandSet::string2CommandSet(line, command);
 }
 
 const char* baseName(const char* path) {

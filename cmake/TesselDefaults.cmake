@@ -24,7 +24,11 @@ if(CCACHE_PROGRAM)
 endif()
 
 add_compile_options(-Wall -Wextra -Wpedantic -Wconversion -Wshadow -Werror)
+add_compile_options(-fno-semantic-interposition -fno-plt)  # the libraries are one product
 add_link_options(-Wl,--no-undefined -Wl,--as-needed -Wl,-z,now)
+if(CMAKE_CXX_COMPILER_ID STREQUAL "GNU" AND CMAKE_CXX_COMPILER_VERSION VERSION_LESS 13)
+  add_compile_options(-Wno-restrict)  # warns of std::string's own operator+
+endif()
 include_directories(${PROJECT_SOURCE_DIR})
 
 if(TESSEL_SANITIZE)

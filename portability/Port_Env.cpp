@@ -1,5 +1,7 @@
 #include "interfaces/portability/Port_Env.h"
 
+#include <cerrno>
+#include <cstddef>
 #include <cstdlib>
 #include <cstring>
 #include <string>
@@ -11,7 +13,10 @@ const char* Port_Env::GetEnv(const char* name) { return std::getenv(name); }
 int Port_Env::PutEnv(const char* text) {
   const char* equals = std::strchr(text, '=');
   if (equals == nullptr) return EINVAL;
-  return setVariable(std::string(text, equals).c_str(), equals + 1);
+  std::string name(text);
+  const auto length = static_cast<std::size_t>(equals - text);
+  name[length] = '\0';
+  return setVariable(name.c_str(), name.c_str() + length + 1);
 }
 
 int Port_Env::UnsetEnv(const char* name) { return unsetVariable(name); }

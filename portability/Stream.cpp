@@ -26,6 +26,8 @@ bool Stream::fill() {
   begin_ = end_ = 0;
   const long count = Descriptor::read(descriptor_, buffer_.data(), buffer_.size(), error_);
   end_ = count > 0 ? static_cast<std::size_t>(count) : 0;
+  if (std::memchr(buffer_.data(), '\0', end_) != nullptr)
+    std::replace(buffer_.data(), buffer_.data() + end_, '\0', substitute);
   return end_ > 0;
 }
 
@@ -49,7 +51,6 @@ bool Stream::readline(Stream& stream, char* buffer, int size) {
     if (!ended && taken < wanted) break;
   }
   if (!any) return false;
-  if (std::memchr(buffer, '\0', length) != nullptr) std::replace(buffer, buffer + length, '\0', substitute);
   if (ended && length > 0 && buffer[length - 1] == '\r') --length;
   buffer[length] = '\0';
   return true;

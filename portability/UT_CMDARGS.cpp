@@ -1,48 +1,58 @@
 #include "interfaces/portability/UT_CMDARGS.h"
 
 #include <cstring>
+#include <memory>
+#include <type_traits>
 
 #include "interfaces/portability/UT_STR.h"
 
 std::int32_t UT_CMDARGINFO::getargnum32() const { return UT_STR::AToL(text_); }
 
 UT_CMDARGS::UT_CMDARGS(int count, const char* const* words) {
+  // No destructor has anything to do, so that one block of memory can hold all.
+  static_assert(std::is_trivially_destructible_v<UT_CMDSWINFO> && std::is_trivially_destructible_v<UT_CMDARGINFO>);
+  static_assert(alignof(UT_CMDSWINFO) >= alignof(UT_CMDARGINFO) && sizeof(UT_CMDSWINFO) % alignof(UT_CMDARGINFO) == 0);
   if (count < 1) return;
   const std::span<const char* const> all(words, static_cast<std::size_t>(count));
-  std::size_t size = 0;
+  std::size_t textSize = 0;
   std::size_t switchCount = 0;
   for (const char* word : all) {
-    size += std::strlen(word) + 1;
+    textSize += std::strlen(word) + 1;
     if (isSwitch(word)) ++switchCount;
   }
-  text_ = std::make_unique_for_overwrite<char[]>(size);
-  switches_.reserve(switchCount);
-  arguments_.reserve(all.size());  // never grows below: the switches point into it
+  const std::size_t switchBytes = switchCount * sizeof(UT_CMDSWINFO);
+  const std::size_t argumentBytes = all.size() * sizeof(UT_CMDARGINFO);
+  memory_ = std::make_unique_for_overwrite<std::byte[]>(switchBytes + argumentBytes + textSize);
+  auto* const switches = reinterpret_cast<UT_CMDSWINFO*>(memory_.get());
+  auto* const arguments = reinterpret_cast<UT_CMDARGINFO*>(memory_.get() + switchBytes);
+  auto* text = reinterpret_cast<char*>(memory_.get() + switchBytes + argumentBytes);
 
-  char* end = text_.get();
+  auto* nextSwitch = switches;
+  auto* nextArgument = arguments;
+  auto* firstArgument = arguments;
   const char* switchName = nullptr;
-  std::size_t firstArgument = 0;
   const auto closeSwitch = [&] {
     if (switchName == nullptr)
-      ownArguments_ = arguments_.size();
+      ownArguments_ = static_cast<std::size_t>(nextArgument - arguments);
     else
-      switches_.emplace_back(switchName, std::span<const UT_CMDARGINFO>(arguments_).subspan(firstArgument));
-    firstArgument = arguments_.size();
+      std::construct_at(nextSwitch++, switchName, std::span<const UT_CMDARGINFO>(firstArgument, nextArgument));
+    firstArgument = nextArgument;
   };
   for (const char* const& word : all) {
-    const std::size_t length = std::strlen(word) + 1;
-    std::memcpy(end, word, length);
+    const std::size_t size = std::strlen(word) + 1;
+    std::memcpy(text, word, size);
     if (&word == &all.front()) {
-      command_ = end;
+      command_ = text;
     } else if (isSwitch(word)) {
       closeSwitch();
-      switchName = end;
+      switchName = text;
     } else {
-      arguments_.emplace_back(end);
+      std::construct_at(nextArgument++, text);
     }
-    end += length;
+    text += size;
   }
   closeSwitch();
+  switches_ = {switches, nextSwitch};
 }
 
 const UT_CMDSWINFO* UT_CMDARGS::getsw(int index) const {

@@ -8,11 +8,6 @@ namespace {
 
 const char* textOf(const char* text) { return text == nullptr ? "" : text; }
 
-unsigned char lower(char character) {
-  const auto code = static_cast<unsigned char>(character);
-  return code >= 'A' && code <= 'Z' ? static_cast<unsigned char>(code + ('a' - 'A')) : code;
-}
-
 /// Where a byte that is no UTF-8 goes in wide text: a range that no valid text uses.
 constexpr wchar_t strayBase = 0xDC00;
 
@@ -56,13 +51,11 @@ int UT_STR::Len(const char* text) { return static_cast<int>(std::strlen(textOf(t
 
 int UT_STR::Compare(const char* a, const char* b) { return std::strcmp(textOf(a), textOf(b)); }
 
-int UT_STR::ICompare(const char* a, const char* b) { return INCompare(a, b, std::numeric_limits<int>::max()); }
-
 int UT_STR::INCompare(const char* a, const char* b, int count) {
   a = textOf(a);
   b = textOf(b);
   for (int i = 0; i < count; ++i) {
-    const int difference = lower(a[i]) - lower(b[i]);
+    const int difference = Lower(a[i]) - Lower(b[i]);
     if (difference != 0 || a[i] == '\0') return difference;
   }
   return 0;
@@ -77,7 +70,7 @@ bool UT_STR::IMatch(const char* text, const char* pattern) {
     if (*pattern == '*') {
       star = pattern++;
       resume = text;
-    } else if (lower(*text) == lower(*pattern)) {
+    } else if (Lower(*text) == Lower(*pattern)) {
       ++text;
       ++pattern;
     } else if (star != nullptr) {

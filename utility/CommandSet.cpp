@@ -1,5 +1,6 @@
 #include "interfaces/utility/CommandSet.h"
 
+#include <algorithm>
 #include <charconv>
 #include <cstdint>
 #include <cstdio>
@@ -14,26 +15,23 @@
 namespace {
 
 constexpr std::size_t usualWordLength = 16;
+constexpr std::size_t usualWordCount = 8;
 
 Port_MsgManData message(int line) { return Port_MsgManData::createObject("tESSEL", "../s/CommandSet", line, ""); }
 
 bool isBlank(char character) { return character == ' ' || character == '\t'; }
 
-/// Reads one word, whose quotes are dropped, and moves past it. False when a quote stays open.
-bool readWord(const char*& place, const char* end, std::string& text) {
-  bool quoted = false;
-  for (; place != end && (quoted || !isBlank(*place)); ++place) {
-    if (*place == '"')
-      quoted = !quoted;
-    else
-      text += *place;
-  }
-  return !quoted;
-}
-
 const char* skipBlanks(const char* place, const char* end) {
   while (place != end && isBlank(*place)) ++place;
   return place;
+}
+
+/// All empty words of all sets; they take no text.
+constexpr const char* emptyWord = "";
+
+/// A word of one text at the same place in another.
+const char* moved(const char* word, const char* from, const char* to) {
+  return word == emptyWord ? emptyWord : to + (word - from);
 }
 
 enum class Lowering { notANumber, done, tooLarge };
@@ -57,92 +55,136 @@ Lowering lower(std::string_view word, std::string& lowered) {
 
 CommandSet::CommandSet(int capacity) {
   const auto words = static_cast<std::size_t>(capacity < 0 ? 0 : capacity);
-  starts_.reserve(words);
-  text_.reserve(words * usualWordLength);
+  words_.reserve(words);
+  reserveText(words * usualWordLength);
 }
 
-CommandSet::CommandSet(const CommandSet& other)
-    : text_(other.text_), starts_(other.starts_), converted_(other.converted_) {}
+CommandSet::CommandSet(const CommandSet& other) { *this = other; }
 
 CommandSet& CommandSet::operator=(const CommandSet& other) {
-  text_ = other.text_;
-  starts_ = other.starts_;
-  pointers_.clear();
+  if (this == &other) return *this;
+  size_ = 0;
+  words_.clear();
+  reserveText(other.size_);
+  words_.reserve(other.words_.size());
+  if (other.size_ > 0) std::memcpy(text_.get(), other.text_.get(), other.size_);
+  for (const char* word : other.words_) words_.push_back(moved(word, other.text_.get(), text_.get()));
+  size_ = other.size_;
   converted_ = other.converted_;
   return *this;
 }
 
+void CommandSet::reserveText(std::size_t size) {
+  if (size <= capacity_ - size_) return;
+  const std::size_t capacity = std::max(2 * capacity_, size_ + size);
+  auto text = std::make_unique_for_overwrite<char[]>(capacity);
+  if (size_ > 0) std::memcpy(text.get(), text_.get(), size_);
+  for (const char*& word : words_) word = moved(word, text_.get(), text.get());
+  text_ = std::move(text);
+  capacity_ = capacity;
+}
+
 std::unique_ptr<CommandSet> CommandSet::string2CommandSet(const char* line) {
+  auto set = std::make_unique<CommandSet>(0);
+  if (!string2CommandSet(line, *set)) set.reset();
+  return set;
+}
+
+bool CommandSet::string2CommandSet(const char* line, CommandSet& set) {
   const char* end = line + std::strlen(line);
   if (end != line && end[-1] == '\n') {
     --end;
     if (end != line && end[-1] == '\r') --end;
   }
   const char* place = skipBlanks(line, end);
-  if (place != end && (*place == '#' || (*place == '/' && place + 1 != end && place[1] == '/'))) return nullptr;
+  if (place != end && (*place == '#' || (*place == '/' && place + 1 != end && place[1] == '/'))) return false;
+  set.clear();
+  if (place == end)
+    set.words_.push_back(emptyWord);
+  else if (!set.splitWords(place, end))
+    message(__LINE__).issueWarning("Missing closing quote, the text ends with the line: %s\n", std::string(line, end));
+  return true;
+}
 
-  auto set = std::make_unique<CommandSet>(0);
-  if (place == end) {
-    set->addCommand("");
-    return set;
-  }
-  set->starts_.reserve(8);
-  set->text_.reserve(static_cast<std::size_t>(end - place) + 8);
-  bool closed = true;
+void CommandSet::clear() {
+  size_ = 0;
+  words_.clear();
+  converted_ = false;
+}
+
+/// False when a quote stays open.
+bool CommandSet::splitWords(const char* place, const char* end) {
+  // Every character but one that separates is stored once; a word that ends with the line adds its zero.
+  reserveText(static_cast<std::size_t>(end - place) + 1);
+  words_.reserve(usualWordCount);
+  bool quoted = false;
   while (place != end) {
-    set->starts_.push_back(set->text_.size());
-    closed = readWord(place, end, set->text_);
-    set->text_ += '\0';
+    openWord();
+    for (; place != end && (quoted || !isBlank(*place)); ++place) {
+      if (*place == '"')
+        quoted = !quoted;
+      else
+        put(*place);
+    }
+    put('\0');
     place = skipBlanks(place, end);
   }
-  if (!closed)
-    message(__LINE__).issueWarning("Missing closing quote, the text ends with the line: %s\n", std::string(line, end));
-  return set;
-}
-
-const char* CommandSet::getCommand(int index) const {
-  if (index < 0 || index >= getNumberCommands()) return "";
-  return text_.data() + starts_[static_cast<std::size_t>(index)];
-}
-
-const char* const* CommandSet::getCommands() const {
-  if (pointers_.empty()) {
-    pointers_.reserve(starts_.size() + 1);
-    for (const std::size_t start : starts_) pointers_.push_back(text_.data() + start);
-    pointers_.push_back(nullptr);
-  }
-  return pointers_.data();
+  return !quoted;
 }
 
 void CommandSet::addCommand(const char* word) {
-  starts_.push_back(text_.size());
-  text_.append(word, std::strlen(word) + 1);
-  pointers_.clear();
+  if (*word == '\0') {
+    words_.push_back(emptyWord);
+    return;
+  }
+  const std::size_t size = std::strlen(word) + 1;
+  // The word may be one of this set's own.
+  const std::string copy(capacity_ - size_ < size ? word : "");
+  reserveText(size);
+  openWord();
+  std::memcpy(text_.get() + size_, copy.empty() ? word : copy.c_str(), size);
+  size_ += size;
 }
 
 void CommandSet::addCommand(int number) { addCommand(std::to_string(number).c_str()); }
 
 bool CommandSet::decrementPositions() {
   if (converted_) return true;
-  CommandSet result(getNumberCommands() + 1);
   bool positions = false;
-  bool changed = false;
   std::string lowered;
-  for (int i = 0; i < getNumberCommands(); ++i) {
-    const char* word = getCommand(i);
-    if (i > 0 && UT_CMDARGS::isSwitch(word))
+  for (std::size_t i = 1; i < words_.size(); ++i) {
+    const char* word = words_[i];
+    if (UT_CMDARGS::isSwitch(word)) {
       positions = UT_STR::ICompare(word, "-p") == 0 || UT_STR::ICompare(word, "-position") == 0;
-    const Lowering outcome = positions && *word != '\0' ? lower(word, lowered) : Lowering::notANumber;
-    if (outcome == Lowering::tooLarge) {
-      message(__LINE__).issueError("Position %s is out of range, positions start at 1.\n", word);
-      return false;
+      continue;
     }
-    changed = changed || outcome == Lowering::done;
-    result.addCommand(outcome == Lowering::done ? lowered.c_str() : word);
+    if (!positions || *word == '\0') continue;
+    switch (lower(word, lowered)) {
+      case Lowering::notANumber:
+        break;
+      case Lowering::tooLarge:
+        message(__LINE__).issueError("Position %s is out of range, positions start at 1.\n", word);
+        return false;
+      case Lowering::done:
+        replaceWord(i, lowered);
+        break;
+    }
   }
-  if (changed) *this = std::move(result);
   converted_ = true;
   return true;
+}
+
+void CommandSet::replaceWord(std::size_t index, const std::string& word) {
+  const std::size_t size = word.size() + 1;
+  char* place = text_.get() + (words_[index] - text_.get());
+  if (size > std::strlen(place) + 1) {
+    // It does not fit where the old one stands, which is left unused.
+    reserveText(size);
+    place = text_.get() + size_;
+    size_ += size;
+    words_[index] = place;
+  }
+  std::memcpy(place, word.c_str(), size);
 }
 
 void CommandSet::printCommands(bool echo) const {

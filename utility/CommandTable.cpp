@@ -1,8 +1,10 @@
 #include "utility/CommandTable.h"
 
 #include <algorithm>
+#include <cstdint>
 #include <deque>
 #include <string>
+#include <string_view>
 #include <unordered_map>
 
 #include "interfaces/portability/UT_STR.h"
@@ -10,12 +12,19 @@
 namespace CommandTable {
 namespace {
 
-std::string lowered(const char* word) {
-  std::string text = word;
-  for (char& character : text)
-    if (character >= 'A' && character <= 'Z') character = static_cast<char>(character + ('a' - 'A'));
-  return text;
-}
+struct HashIgnoringCase {
+  std::size_t operator()(std::string_view word) const {
+    std::uint32_t hash = 2166136261U;
+    for (const char character : word) hash = (hash ^ static_cast<std::uint32_t>(UT_STR::Lower(character))) * 16777619U;
+    return hash;
+  }
+};
+
+struct EqualIgnoringCase {
+  bool operator()(std::string_view a, std::string_view b) const {
+    return a.size() == b.size() && UT_STR::INCompare(a.data(), b.data(), static_cast<int>(a.size())) == 0;
+  }
+};
 
 class Index {
  public:
@@ -27,7 +36,7 @@ class Index {
   const std::vector<const Command*>& all() const { return sorted_; }
 
   const Command* find(const char* word) const {
-    const auto place = byWord_.find(lowered(word));
+    const auto place = byWord_.find(word);
     return place == byWord_.end() ? nullptr : place->second;
   }
 
@@ -49,7 +58,7 @@ class Index {
 
   void add(const Command& command) {
     sorted_.push_back(&command);
-    const std::string word = lowered(command.word);
+    const std::string_view word = command.word;
     byWord_.emplace(word, &command);
     for (std::size_t length = static_cast<std::size_t>(command.shortest); length > 0 && length < word.size(); ++length)
       byWord_.emplace(word.substr(0, length), &command);
@@ -61,7 +70,7 @@ class Index {
   }
 
   std::vector<const Command*> sorted_;
-  std::unordered_map<std::string, const Command*> byWord_;
+  std::unordered_map<std::string_view, const Command*, HashIgnoringCase, EqualIgnoringCase> byWord_;
   std::deque<std::string> acceptedWords_;
   std::deque<Command> accepted_;
 };

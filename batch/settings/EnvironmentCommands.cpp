@@ -12,7 +12,9 @@ bool CmdParser::setEnv(UT_CMDARGS& args) {
   if (name == nullptr) return failure("-env is required.\n");
   const UT_CMDSWINFO* value = args.getsw("-value", 0);
   if (value == nullptr) return failure("-value is required.\n");
-  Port_Env::PutEnv((std::string(name->getargtxt(0)) + "=" + value->getargtxt(0)).c_str());
+  std::string text = name->getargtxt(0);
+  text.append("=").append(value->getargtxt(0));
+  Port_Env::PutEnv(text.c_str());
   return true;
 }
 

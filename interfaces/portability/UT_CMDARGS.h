@@ -1,7 +1,8 @@
 #pragma once
 
+#include <cstddef>
 #include <memory>
-#include <vector>
+#include <span>
 
 #include "interfaces/Export.h"
 #include "interfaces/portability/UT_CMDSWINFO.h"
@@ -34,9 +35,9 @@ class TESSEL_EXPORT UT_CMDARGS {
   bool findsw(const char* name) const { return getsw(name, 0) != nullptr; }
 
  private:
-  std::unique_ptr<char[]> text_;
+  /// The switches, the arguments and the texts, one behind the other.
+  std::unique_ptr<std::byte[]> memory_;
   const char* command_ = "";
-  std::vector<UT_CMDARGINFO> arguments_;
-  std::vector<UT_CMDSWINFO> switches_;
+  std::span<const UT_CMDSWINFO> switches_;
   std::size_t ownArguments_ = 0;
 };

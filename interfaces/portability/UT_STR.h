@@ -13,10 +13,23 @@ class TESSEL_EXPORT UT_STR {
  public:
   static int Len(const char* text);
 
+  /// The code of a character, that of the small letter for a capital one.
+  static constexpr int Lower(char character) {
+    const auto code = static_cast<unsigned char>(character);
+    return code >= 'A' && code <= 'Z' ? code + ('a' - 'A') : code;
+  }
+
   /// Below, above or equal to 0 as `a` sorts before, after or the same as `b`.
   static int Compare(const char* a, const char* b);
   /// `Compare` without regard to letter case.
-  static int ICompare(const char* a, const char* b);
+  static int ICompare(const char* a, const char* b) {
+    if (a == nullptr) a = "";
+    if (b == nullptr) b = "";
+    for (;; ++a, ++b) {
+      const int difference = Lower(*a) - Lower(*b);
+      if (difference != 0 || *a == '\0') return difference;
+    }
+  }
   /// `ICompare` of the first `count` characters.
   static int INCompare(const char* a, const char* b, int count);
 

@@ -1,5 +1,6 @@
 #pragma once
 
+#include <cstddef>
 #include <memory>
 #include <string>
 #include <vector>
@@ -22,19 +23,24 @@ class TESSEL_EXPORT CommandSet {
   /// character; a line end is stripped; a quote that is not closed ends with the line, after a warning.
   /// A line of blanks only is one empty word. A comment (its first word begins with `#` or `//`) gives null.
   static std::unique_ptr<CommandSet> string2CommandSet(const char* line);
+  /// The same into a set that is there, so that a reader of many lines need not make many; false for null.
+  static bool string2CommandSet(const char* line, CommandSet& set);
 
-  int getNumberCommands() const { return static_cast<int>(starts_.size()); }
+  int getNumberCommands() const { return static_cast<int>(words_.size()); }
   /// Word `index`, from 0; the empty text past the last one. Valid until a word is added.
-  const char* getCommand(int index) const;
+  const char* getCommand(int index) const {
+    const auto place = static_cast<std::size_t>(index);
+    return index >= 0 && place < words_.size() ? words_[place] : "";
+  }
   /// All words, `getNumberCommands()` of them. Valid until a word is added.
-  const char* const* getCommands() const;
+  const char* const* getCommands() const { return words_.data(); }
 
   void addCommand(const char* word);
   void addCommand(int number);
 
   /// Makes positions 0-based: lowers by one every whole decimal number (a sign is allowed) that follows a
   /// `-p` or `-position` switch, in any letter case, up to the next switch. Only the first call changes
-  /// the set. False, after an error, when a number does not fit 32 bits; the set is then as before.
+  /// the set. False, after an error, when a number does not fit 32 bits; the set is then unusable.
   bool decrementPositions();
 
   /// Prints the words, one blank between two, as a line on the console when `echo` is true. False is
@@ -42,8 +48,18 @@ class TESSEL_EXPORT CommandSet {
   void printCommands(bool echo) const;
 
  private:
-  std::string text_;  ///< all words, each with a terminating zero
-  std::vector<std::size_t> starts_;
-  mutable std::vector<const char*> pointers_;  ///< made on demand; empty when out of date
+  void clear();
+  /// Makes room for `size` more bytes of text.
+  void reserveText(std::size_t size);
+  /// Begins a word at the end of the text.
+  void openWord() { words_.push_back(text_.get() + size_); }
+  void put(char character) { text_[size_++] = character; }
+  bool splitWords(const char* place, const char* end);
+  void replaceWord(std::size_t index, const std::string& word);
+
+  std::unique_ptr<char[]> text_;  ///< all words, each with a terminating zero
+  std::size_t size_ = 0;
+  std::size_t capacity_ = 0;
+  std::vector<const char*> words_;  ///< into `text_`, but for empty ones
   bool converted_ = false;
 };
