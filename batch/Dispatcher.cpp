@@ -219,13 +219,13 @@ constexpr auto groups = [] {
 }();
 
 bool isWord(std::string_view word, std::string_view name) {
-  // Lengths first: most words of a group begin alike.
-  return word.size() == name.size() && UT_STR::ICompare(word.data(), name.data()) == 0;
+  // Lengths first, for most words of a group begin alike; then the words as the table has them.
+  return word.size() == name.size() && (word == name || UT_STR::ICompare(word.data(), name.data()) == 0);
 }
 
 bool matches(const Row& row, std::string_view word) {
-  if (row.match == Match::twoLetters) return UT_STR::INCompare(word.data(), row.word.data(), 2) == 0;
-  return isWord(word, row.word);
+  if (row.match == Match::wholeWord) return isWord(word, row.word);
+  return UT_STR::INCompare(word.data(), row.word.data(), 2) == 0;
 }
 
 const Row* findRow(std::string_view word) {

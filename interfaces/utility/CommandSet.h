@@ -1,8 +1,8 @@
 #pragma once
 
 #include <cstddef>
+#include <cstdint>
 #include <memory>
-#include <string>
 #include <vector>
 
 #include "interfaces/Export.h"
@@ -51,11 +51,8 @@ class TESSEL_EXPORT CommandSet {
   void clear();
   /// Makes room for `size` more bytes of text.
   void reserveText(std::size_t size);
-  /// Begins a word at the end of the text.
-  void openWord() { words_.push_back(text_.get() + size_); }
-  void put(char character) { text_[size_++] = character; }
   bool splitWords(const char* place, const char* end);
-  void replaceWord(std::size_t index, const std::string& word);
+  void replaceWord(std::size_t index, std::int32_t number);
 
   std::unique_ptr<char[]> text_;  ///< all words, each with a terminating zero
   std::size_t size_ = 0;
