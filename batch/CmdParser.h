@@ -111,6 +111,55 @@ class CmdParser {
   bool setCableOption(UT_CMDARGS& args);
   bool runCableDiagnostics(UT_CMDARGS& args);
 
+  bool addDevice(UT_CMDARGS& args);
+  bool assignFile(UT_CMDARGS& args);
+  bool attachFlash(UT_CMDARGS& args);
+  bool assignFileToAttachedFlash(UT_CMDARGS& args);
+  bool deleteAttachedFlash(UT_CMDARGS& args);
+  bool addAdditionalConfigFile(UT_CMDARGS& args);
+  bool clearAdditionalConfigFiles(UT_CMDARGS& args);
+  bool defineDevice(UT_CMDARGS& args);
+  bool deleteDevice(UT_CMDARGS& args);
+  bool setAttribute(UT_CMDARGS& args);
+
+  /// Runs every command that works on devices through the device manager; may add words to the line.
+  bool runOperation(UT_CMDARGS& args, CommandSet& words);
+  bool programEFuse(UT_CMDARGS& args, CommandSet& words);
+
+  bool addCollection(UT_CMDARGS& args);
+  bool deleteCollection(UT_CMDARGS& args);
+  bool renameCollection(UT_CMDARGS& args);
+  bool setCurrentCollection(UT_CMDARGS& args);
+  bool addDesign(UT_CMDARGS& args);
+  bool deleteDesign(UT_CMDARGS& args);
+  bool setCurrentDesign(UT_CMDARGS& args);
+  bool addDeviceChain(UT_CMDARGS& args);
+  bool deleteDeviceChain(UT_CMDARGS& args);
+  bool setCurrentDeviceChain(UT_CMDARGS& args);
+  bool addConfigDevice(UT_CMDARGS& args);
+  bool deleteConfigDevice(UT_CMDARGS& args);
+  bool addPromDevice(UT_CMDARGS& args);
+  bool deletePromDevice(UT_CMDARGS& args);
+  bool generate(UT_CMDARGS& args, CommandSet& words);
+  bool loadPdr(UT_CMDARGS& args);
+
+  bool saveProjectFile(UT_CMDARGS& args);
+  /// Of loadProjectFile and loadCdf.
+  bool loadProjectFile(UT_CMDARGS& args);
+  bool saveCdf(UT_CMDARGS& args);
+  bool saveArchive(UT_CMDARGS& args);
+  bool loadArchive(UT_CMDARGS& args);
+  bool saveCmd(UT_CMDARGS& args);
+  bool setLog(UT_CMDARGS& args);
+  bool renameBatchCmdFile(UT_CMDARGS& args);
+
+  // Operations that no command word leads to.
+
+  /// Sets an attribute of the output configuration device; `quiet` keeps it out of the batch-command file.
+  bool setConfigDeviceAttribute(ConfigDeviceNS::ATTRIBUTE attribute, const char* value, bool quiet);
+  bool renamePromFile(UT_CMDARGS& args);
+  bool renameMpmFile(UT_CMDARGS& args);
+
  private:
   /// Writes the transcript to the record stream if saveCmd asked for it.
   void writeRecord();

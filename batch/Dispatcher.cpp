@@ -11,6 +11,7 @@
 #include "interfaces/devicemanager/DeviceManagerInterface.h"
 #include "interfaces/portability/UT_CMDARGS.h"
 #include "interfaces/portability/UT_STR.h"
+#include "interfaces/utility/TesselCmdargs.h"
 
 namespace {
 
@@ -24,14 +25,49 @@ struct Row {
   Action action;
 };
 
+/// The device manager's text about the last boundary-scan operation.
+constexpr int stateAttribute = 2;
+
 /// A handler that needs the switches only.
 template <bool (CmdParser::*handler)(UT_CMDARGS&)>
 bool call(CmdParser& session, UT_CMDARGS& args, CommandSet& /*line*/) {
   return (session.*handler)(args);
 }
 
-bool notBuilt(CmdParser& /*session*/, UT_CMDARGS& /*args*/, CommandSet& line) {
-  return Messages::failure("%s is not built yet\n", line.getCommand(0));
+/// A handler that needs the words as well.
+template <bool (CmdParser::*handler)(UT_CMDARGS&, CommandSet&)>
+bool call(CmdParser& session, UT_CMDARGS& args, CommandSet& line) {
+  return (session.*handler)(args, line);
+}
+
+constexpr Action operation = call<&CmdParser::runOperation>;
+
+bool operationWithState(CmdParser& session, UT_CMDARGS& args, CommandSet& line) {
+  const bool result = session.runOperation(args, line);
+  Messages::debug("State is %s\n", session.deviceManager->getAttribute(stateAttribute));
+  return result;
+}
+
+bool checkIntegrity(CmdParser& session, UT_CMDARGS& args, CommandSet& line) {
+  session.checkRunning = true;
+  const bool result = session.runOperation(args, line);
+  session.checkRunning = false;
+  return result;
+}
+
+/// On a boundary-scan chain MPM devices are looked for as well, behind what was found; that result counts.
+bool identify(CmdParser& session, UT_CMDARGS& args, CommandSet& line) {
+  session.checkRunning = true;
+  bool result = session.runOperation(args, line);
+  if (session.isActiveMode(tESSELNS::BOUNDARY_SCAN)) {
+    CommandSet mpmLine(8);
+    mpmLine.addCommand("identifyMPM");
+    const auto mpmArgs = TesselCmdargs::getCmdargs(mpmLine.getNumberCommands(), mpmLine.getCommands(), true);
+    result = session.runOperation(*mpmArgs, mpmLine);
+  }
+  session.lastIdentifyOk = result;
+  session.checkRunning = false;
+  return result;
 }
 
 bool clearCmd(CmdParser& session, UT_CMDARGS& /*args*/, CommandSet& /*line*/) {
@@ -77,119 +113,119 @@ constexpr Row twoLetters(const char* word, Action action) { return {word, Match:
 
 /// All command words, grouped by their first letter; in a group the first row that matches wins.
 constexpr Row rows[] = {
-    whole("addAdditionalConfigFile", notBuilt),
-    whole("addDevice", notBuilt),
-    whole("attachFlash", notBuilt),
-    whole("assignFile", notBuilt),
-    whole("assignFileToAttachedFlash", notBuilt),
-    whole("addCollection", notBuilt),
-    whole("addConfigDevice", notBuilt),
-    whole("addDesign", notBuilt),
-    whole("addDeviceChain", notBuilt),
-    whole("addPromDevice", notBuilt),
+    whole("addAdditionalConfigFile", call<&CmdParser::addAdditionalConfigFile>),
+    whole("addDevice", call<&CmdParser::addDevice>),
+    whole("attachFlash", call<&CmdParser::attachFlash>),
+    whole("assignFile", call<&CmdParser::assignFile>),
+    whole("assignFileToAttachedFlash", call<&CmdParser::assignFileToAttachedFlash>),
+    whole("addCollection", call<&CmdParser::addCollection>),
+    whole("addConfigDevice", call<&CmdParser::addConfigDevice>),
+    whole("addDesign", call<&CmdParser::addDesign>),
+    whole("addDeviceChain", call<&CmdParser::addDeviceChain>),
+    whole("addPromDevice", call<&CmdParser::addPromDevice>),
 
-    whole("blankCheck", notBuilt),
-    whole("bypass", notBuilt),
-    whole("bsdebug", notBuilt),
+    whole("blankCheck", operationWithState),
+    whole("bypass", operationWithState),
+    whole("bsdebug", operationWithState),
 
-    whole("checksum", notBuilt),
-    whole("clamp", notBuilt),
-    whole("checkidcode", notBuilt),
-    whole("checkIntegrity", notBuilt),
+    whole("checksum", operation),
+    whole("clamp", operation),
+    whole("checkidcode", operation),
+    whole("checkIntegrity", checkIntegrity),
     whole("closeCable", closeCable),
     whole("clearCmd", clearCmd),
-    whole("clearAdditionalConfigFiles", notBuilt),
+    whole("clearAdditionalConfigFiles", call<&CmdParser::clearAdditionalConfigFiles>),
     whole("cleanCableLock", cleanCableLock),
 
-    whole("deleteDevice", notBuilt),
-    whole("deleteAttachedFlash", notBuilt),
-    whole("doPreload", notBuilt),
-    whole("defineDevice", notBuilt),
-    whole("deleteCollection", notBuilt),
-    whole("deleteDesign", notBuilt),
-    whole("deleteDeviceChain", notBuilt),
-    whole("deletePromDevice", notBuilt),
-    whole("deleteConfigDevice", notBuilt),
+    whole("deleteDevice", call<&CmdParser::deleteDevice>),
+    whole("deleteAttachedFlash", call<&CmdParser::deleteAttachedFlash>),
+    whole("doPreload", operation),
+    whole("defineDevice", call<&CmdParser::defineDevice>),
+    whole("deleteCollection", call<&CmdParser::deleteCollection>),
+    whole("deleteDesign", call<&CmdParser::deleteDesign>),
+    whole("deleteDeviceChain", call<&CmdParser::deleteDeviceChain>),
+    whole("deletePromDevice", call<&CmdParser::deletePromDevice>),
+    whole("deleteConfigDevice", call<&CmdParser::deleteConfigDevice>),
 
-    whole("erase", notBuilt),
-    whole("expresssvf", notBuilt),
-    whole("expresscsvf", notBuilt),
-    whole("expressstapl", notBuilt),
+    whole("erase", operation),
+    whole("expresssvf", operation),
+    whole("expresscsvf", operation),
+    whole("expressstapl", operation),
     twoLetters("exit", quit),
 
-    whole("functionTest", notBuilt),
+    whole("functionTest", operation),
 
-    whole("generate", notBuilt),
+    whole("generate", call<&CmdParser::generate>),
 
-    whole("highz", notBuilt),
+    whole("highz", operation),
     whole("help", call<&CmdParser::help>),
 
     twoLetters("info", info),
-    twoLetters("identify", notBuilt),
+    twoLetters("identify", identify),
 
-    whole("loadProjectFile", notBuilt),
-    whole("loadCdf", notBuilt),
-    whole("loadPdr", notBuilt),
-    whole("loadArchive", notBuilt),
+    whole("loadProjectFile", call<&CmdParser::loadProjectFile>),
+    whole("loadCdf", call<&CmdParser::loadProjectFile>),
+    whole("loadPdr", call<&CmdParser::loadPdr>),
+    whole("loadArchive", call<&CmdParser::loadArchive>),
     whole("lockcable", lockCable),
-    whole("loadConfigurationRevision", notBuilt),
+    whole("loadConfigurationRevision", operation),
 
-    whole("programues", notBuilt),
-    whole("programSecurityRegister", notBuilt),
-    whole("program", notBuilt),
-    whole("programUsercode", notBuilt),
-    whole("programCustomercode", notBuilt),
-    whole("play", notBuilt),
-    whole("programEFuse", notBuilt),
+    whole("programues", operation),
+    whole("programSecurityRegister", operation),
+    whole("program", operation),
+    whole("programUsercode", operation),
+    whole("programCustomercode", operation),
+    whole("play", operation),
+    whole("programEFuse", call<&CmdParser::programEFuse>),
 
     whole("quit", quit),
 
-    whole("readidcode", notBuilt),
-    whole("readusercode", notBuilt),
-    whole("readdna", notBuilt),
-    whole("readStatusRegister", notBuilt),
-    whole("readmfgcode", notBuilt),
-    whole("readues", notBuilt),
-    whole("readbacktofile", notBuilt),
-    whole("reconfigureOTF", notBuilt),
-    whole("readEFuse", notBuilt),
-    whole("readEFuseControlReg", notBuilt),
-    whole("readPromOptions", notBuilt),
-    whole("readTemperatureAndVoltage", notBuilt),
-    whole("readCustomerCode", notBuilt),
+    whole("readidcode", operation),
+    whole("readusercode", operation),
+    whole("readdna", operation),
+    whole("readStatusRegister", operation),
+    whole("readmfgcode", operation),
+    whole("readues", operation),
+    whole("readbacktofile", operation),
+    whole("reconfigureOTF", operation),
+    whole("readEFuse", operation),
+    whole("readEFuseControlReg", operation),
+    whole("readPromOptions", operation),
+    whole("readTemperatureAndVoltage", operation),
+    whole("readCustomerCode", operation),
     whole("runCableDiagnostics", call<&CmdParser::runCableDiagnostics>),
-    whole("renameCollection", notBuilt),
-    whole("renameBatchCmdFile", notBuilt),
-    whole("readSecurityRegister", notBuilt),
+    whole("renameCollection", call<&CmdParser::renameCollection>),
+    whole("renameBatchCmdFile", call<&CmdParser::renameBatchCmdFile>),
+    whole("readSecurityRegister", operation),
 
     whole("setCable", call<&CmdParser::setCable>),
     whole("setMode", call<&CmdParser::setMode>),
     whole("setsubMode", call<&CmdParser::setsubMode>),
     whole("setPreference", call<&CmdParser::setPreference>),
     whole("setTargetDevice", call<&CmdParser::setTargetDevice>),
-    whole("setAttribute", notBuilt),
-    whole("saveCmd", notBuilt),
-    whole("setLog", notBuilt),
-    whole("saveProjectFile", notBuilt),
-    whole("saveCdf", notBuilt),
-    whole("saveArchive", notBuilt),
-    whole("setCurrentDeviceChain", notBuilt),
-    whole("setCurrentDesign", notBuilt),
-    whole("setCurrentCollection", notBuilt),
+    whole("setAttribute", call<&CmdParser::setAttribute>),
+    whole("saveCmd", call<&CmdParser::saveCmd>),
+    whole("setLog", call<&CmdParser::setLog>),
+    whole("saveProjectFile", call<&CmdParser::saveProjectFile>),
+    whole("saveCdf", call<&CmdParser::saveCdf>),
+    whole("saveArchive", call<&CmdParser::saveArchive>),
+    whole("setCurrentDeviceChain", call<&CmdParser::setCurrentDeviceChain>),
+    whole("setCurrentDesign", call<&CmdParser::setCurrentDesign>),
+    whole("setCurrentCollection", call<&CmdParser::setCurrentCollection>),
     whole("setCableSpeed", call<&CmdParser::setCableSpeed>),
     whole("setCableOption", call<&CmdParser::setCableOption>),
     whole("setEnv", call<&CmdParser::setEnv>),
-    whole("setActiveRevision", notBuilt),
+    whole("setActiveRevision", operation),
     whole("setMbBpiDevice", call<&CmdParser::setMbBpiDevice>),
     whole("setMbBpiType", call<&CmdParser::setMbBpiType>),
     whole("SetMbBpiChain", call<&CmdParser::setMbBpiChain>),
     whole("SetBpiWidth", call<&CmdParser::setBpiWidth>),
-    whole("setEFuseControlReg", notBuilt),
+    whole("setEFuseControlReg", operation),
 
     whole("unlockcable", unlockCable),
     whole("unsetEnv", call<&CmdParser::unsetEnv>),
 
-    whole("verify", notBuilt),
+    whole("verify", operation),
 };
 
 constexpr char firstLetter(std::string_view word) {

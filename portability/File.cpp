@@ -28,7 +28,7 @@ bool pump(int from, int to) {
 
 std::unique_ptr<Stream> File::open(const char* path, int access, bool /*text*/) {
   const bool writing = access != read;
-  if (std::strcmp(path, "-") == 0) return std::make_unique<Stream>(path, writing ? 1 : 0, writing, false);
+  if (!writing && std::strcmp(path, "-") == 0) return std::make_unique<Stream>(path, 0, false, false);
   const int descriptor =
       writing ? Descriptor::openForWriting(path, access == extend) : Descriptor::openForReading(path);
   if (descriptor < 0) return nullptr;

@@ -15,7 +15,7 @@ class TESSEL_EXPORT File {
   enum Access { read = 1, write = 2, extend = 3 };
 
   /// Opens a file for reading (1), for writing (2, which empties or makes it) or for adding to its end (3);
-  /// `text` is true for text files. The path `-` is standard input or standard output. Null on failure, and for a
+  /// `text` is true for text files. The path `-` to read is standard input. Null on failure, and for a
   /// directory.
   static std::unique_ptr<Stream> open(const char* path, int access, bool text);
   /// Writes what is pending and closes the stream, which is null afterwards. False when something that
