@@ -11,14 +11,15 @@
 #include "interfaces/portability/ConsoleControl.h"
 #include "interfaces/portability/File.h"
 #include "interfaces/portability/Port_Env.h"
+#include "interfaces/portability/Secret.h"
 #include "interfaces/utility/TesselPreference.h"
 
-namespace {
-
-constexpr int lineBufferSize = 1023;
-using LineBuffer = std::array<char, lineBufferSize>;
-
-}  // namespace
+/// A line as it was read, and its words; kept from one line to the next.
+struct CmdParser::Line {
+  static constexpr int size = 1023;
+  std::array<char, size> text{};
+  CommandSet command{0};
+};
 
 CmdParser::CmdParser() : deviceManager(DeviceManagerInterface::getDeviceManager()) {
   if (Port_Env::GetEnv("ZOR_TESSEL_ALLOWBATCHMODECALLBACK") != nullptr) allowBatchCallback = 1;
@@ -41,18 +42,17 @@ bool CmdParser::runCommandLine() {
   interactive = 1;
   bool result = true;
   TesselPreference::getPreferenceObject().dump();
-  LineBuffer line;
-  CommandSet command(0);
+  Line line;
   while (!quitRequested) {
     Port::Console::print(">");
-    if (!Port::Console::readLine(line.data(), lineBufferSize)) {
+    if (!Port::Console::readLine(line.text.data(), Line::size)) {
       interruptRequested = 1;
       quitRequested = true;
     } else if (interruptRequested != 0) {
       quitRequested = true;
       Port::Console::print("QUIT.\n");
-    } else if (recordAndTokenise(line.data(), command)) {
-      const bool lineResult = processLine(command);
+    } else {
+      const bool lineResult = runLine(line, result);
       // The line that ends the session leaves the result of the one before it.
       if (!quitRequested) result = lineResult;
     }
@@ -69,10 +69,11 @@ bool CmdParser::runCommandFile(const char* path) {
   interactive = 0;
   bool result = true;
   TesselPreference::getPreferenceObject().dump();
-  LineBuffer line;
-  CommandSet command(0);
-  while (!quitRequested && result && Port::Stream::readline(*commandFile, line.data(), lineBufferSize))
-    if (recordAndTokenise(line.data(), command)) result = processLine(command);
+  Line line;
+  while (!quitRequested && result && Port::Stream::readline(*commandFile, line.text.data(), Line::size)) {
+    result = runLine(line, result);
+    if (line.command.holdsKey()) commandFile->wipeRead();
+  }
   if (commandFile->error() != 0)
     result = Messages::failure("Read error in file %s: %s\n", path, std::strerror(commandFile->error()));
   if (result && inRepeat) {
@@ -85,9 +86,16 @@ bool CmdParser::runCommandFile(const char* path) {
   return result;
 }
 
+bool CmdParser::runLine(Line& line, bool result) {
+  if (recordAndTokenise(line.text.data(), line.command)) result = processLine(line.command);
+  if (line.command.holdsKey()) Port::Secret::wipe(line.text.data(), line.text.size());
+  return result;
+}
+
 void CmdParser::writeRecord() {
   if (!recordOn) return;
   recordOn = false;
+  if (recordStream == nullptr) return;
   const std::string path = recordStream->path();
   *recordStream << commandText;
   if (!Port::File::close(recordStream)) Messages::error("Write error, file %s is not complete\n", path);

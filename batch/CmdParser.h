@@ -21,9 +21,10 @@ class UT_CMDARGS;
 ///   session.setMsgWrite(false);                          // no batch log
 ///   const bool ok = session.runCommandFile("line.cmd");  // goes on at the prompt unless the file quits
 ///
-/// One thread uses a session. Ctrl-C lets the running command end and stops before the next line. Errors
-/// are reported through the message dispatcher; the results tell success. Only the first five members are
-/// exported from the library.
+/// One session at a time, used by one thread: its end releases the process-wide device manager. Ctrl-C lets the running
+/// command end and stops before the next line. Errors are reported through the message dispatcher; the results tell
+/// success. The control handler stays registered after the session's end. Only the first five members are exported from
+/// the library.
 class CmdParser {
  public:
   TESSEL_EXPORT CmdParser();
@@ -161,6 +162,10 @@ class CmdParser {
   bool renameMpmFile(UT_CMDARGS& args);
 
  private:
+  struct Line;
+
+  /// Records and carries out a line; the result stays as it is for a comment. A line with a key is wiped.
+  bool runLine(Line& line, bool result);
   /// Writes the transcript to the record stream if saveCmd asked for it.
   void writeRecord();
 };

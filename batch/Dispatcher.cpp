@@ -19,10 +19,14 @@ using Action = bool (*)(CmdParser& session, UT_CMDARGS& args, CommandSet& line);
 
 enum class Match { wholeWord, twoLetters };
 
+/// Whether a command can do without a device manager.
+enum class Needs { manager, nothing };
+
 struct Row {
   std::string_view word;
   Match match;
   Action action;
+  Needs needs = Needs::manager;
 };
 
 /// The device manager's text about the last boundary-scan operation.
@@ -93,8 +97,8 @@ bool unlockCable(CmdParser& session, UT_CMDARGS& /*args*/, CommandSet& /*line*/)
   return session.deviceManager->unlockCable();
 }
 
-/// Words other than the whole "quit" and "exit", which the line processor takes. The record gets
-/// "repeatEnd" here on purpose: readers of old batch-command files count on it.
+/// Words other than the whole "quit" and "exit", which the line processor takes. Deliberate: the record gets
+/// "repeatEnd" here, not "quit".
 bool quit(CmdParser& session, UT_CMDARGS& /*args*/, CommandSet& /*line*/) {
   session.quitRequested = true;
   record(session, "repeatEnd");
@@ -108,8 +112,12 @@ bool info(CmdParser& session, UT_CMDARGS& /*args*/, CommandSet& /*line*/) {
   return result;
 }
 
-constexpr Row whole(const char* word, Action action) { return {word, Match::wholeWord, action}; }
-constexpr Row twoLetters(const char* word, Action action) { return {word, Match::twoLetters, action}; }
+constexpr Row whole(const char* word, Action action, Needs needs = Needs::manager) {
+  return {word, Match::wholeWord, action, needs};
+}
+constexpr Row twoLetters(const char* word, Action action, Needs needs = Needs::manager) {
+  return {word, Match::twoLetters, action, needs};
+}
 
 /// All command words, grouped by their first letter; in a group the first row that matches wins.
 constexpr Row rows[] = {
@@ -133,7 +141,7 @@ constexpr Row rows[] = {
     whole("checkidcode", operation),
     whole("checkIntegrity", checkIntegrity),
     whole("closeCable", closeCable),
-    whole("clearCmd", clearCmd),
+    whole("clearCmd", clearCmd, Needs::nothing),
     whole("clearAdditionalConfigFiles", call<&CmdParser::clearAdditionalConfigFiles>),
     whole("cleanCableLock", cleanCableLock),
 
@@ -151,14 +159,14 @@ constexpr Row rows[] = {
     whole("expresssvf", operation),
     whole("expresscsvf", operation),
     whole("expressstapl", operation),
-    twoLetters("exit", quit),
+    twoLetters("exit", quit, Needs::nothing),
 
     whole("functionTest", operation),
 
     whole("generate", call<&CmdParser::generate>),
 
     whole("highz", operation),
-    whole("help", call<&CmdParser::help>),
+    whole("help", call<&CmdParser::help>, Needs::nothing),
 
     twoLetters("info", info),
     twoLetters("identify", identify),
@@ -178,7 +186,7 @@ constexpr Row rows[] = {
     whole("play", operation),
     whole("programEFuse", call<&CmdParser::programEFuse>),
 
-    whole("quit", quit),
+    whole("quit", quit, Needs::nothing),
 
     whole("readidcode", operation),
     whole("readusercode", operation),
@@ -204,8 +212,8 @@ constexpr Row rows[] = {
     whole("setPreference", call<&CmdParser::setPreference>),
     whole("setTargetDevice", call<&CmdParser::setTargetDevice>),
     whole("setAttribute", call<&CmdParser::setAttribute>),
-    whole("saveCmd", call<&CmdParser::saveCmd>),
-    whole("setLog", call<&CmdParser::setLog>),
+    whole("saveCmd", call<&CmdParser::saveCmd>, Needs::nothing),
+    whole("setLog", call<&CmdParser::setLog>, Needs::nothing),
     whole("saveProjectFile", call<&CmdParser::saveProjectFile>),
     whole("saveCdf", call<&CmdParser::saveCdf>),
     whole("saveArchive", call<&CmdParser::saveArchive>),
@@ -214,7 +222,7 @@ constexpr Row rows[] = {
     whole("setCurrentCollection", call<&CmdParser::setCurrentCollection>),
     whole("setCableSpeed", call<&CmdParser::setCableSpeed>),
     whole("setCableOption", call<&CmdParser::setCableOption>),
-    whole("setEnv", call<&CmdParser::setEnv>),
+    whole("setEnv", call<&CmdParser::setEnv>, Needs::nothing),
     whole("setActiveRevision", operation),
     whole("setMbBpiDevice", call<&CmdParser::setMbBpiDevice>),
     whole("setMbBpiType", call<&CmdParser::setMbBpiType>),
@@ -223,15 +231,12 @@ constexpr Row rows[] = {
     whole("setEFuseControlReg", operation),
 
     whole("unlockcable", unlockCable),
-    whole("unsetEnv", call<&CmdParser::unsetEnv>),
+    whole("unsetEnv", call<&CmdParser::unsetEnv>, Needs::nothing),
 
     whole("verify", operation),
 };
 
-constexpr char firstLetter(std::string_view word) {
-  if (word.empty()) return '\0';
-  return word[0] >= 'A' && word[0] <= 'Z' ? static_cast<char>(word[0] + ('a' - 'A')) : word[0];
-}
+constexpr int firstLetter(std::string_view word) { return word.empty() ? 0 : UT_STR::Lower(word[0]); }
 
 constexpr bool isGrouped() {
   return std::is_sorted(std::begin(rows), std::end(rows),
@@ -247,7 +252,7 @@ struct Group {
 constexpr auto groups = [] {
   std::array<Group, 'z' - 'a' + 1> made{};
   for (std::size_t i = 0; i < made.size(); ++i) {
-    const auto inGroup = [i](const Row& row) { return firstLetter(row.word) == static_cast<char>('a' + i); };
+    const auto inGroup = [i](const Row& row) { return firstLetter(row.word) == static_cast<int>('a' + i); };
     const Row* begin = std::find_if(std::begin(rows), std::end(rows), inGroup);
     made[i] = {begin, std::find_if_not(begin, std::end(rows), inGroup)};
   }
@@ -265,7 +270,7 @@ bool matches(const Row& row, std::string_view word) {
 }
 
 const Row* findRow(std::string_view word) {
-  const char letter = firstLetter(word);
+  const int letter = firstLetter(word);
   if (letter < 'a' || letter > 'v') return nullptr;
   const Group& group = groups[static_cast<std::size_t>(letter - 'a')];
   const Row* row = std::find_if(group.begin, group.end, [word](const Row& each) { return matches(each, word); });
@@ -290,7 +295,7 @@ bool convert(std::string_view word, const CommandSet& line, bool& result) {
 }
 
 void registerProgress(CmdParser& session, const UT_CMDARGS& args) {
-  if (!session.modeSet) return;
+  if (!session.modeSet || session.deviceManager == nullptr) return;
   if (args.findsw("-showprogress")) session.deviceManager->setCallbackFunction(progressCallback);
   if (allowBatchCallback != 0) session.deviceManager->setCallbackFunction(progressCallback);
 }
@@ -305,10 +310,13 @@ bool CmdParser::dispatch(CommandSet& line) {
   if (convert(word, line, converted)) return converted;
   std::unique_ptr<UT_CMDARGS> args;
   if (!parseCommand(args, line)) return false;
-  if (deviceManager == nullptr) return Messages::failure("There is no device manager.\n");
   registerProgress(*this, *args);
-  if (const Row* row = findRow(word)) return row->action(*this, *args, line);
-  // Words that begin with F fail without a message; scripts rely on it.
+  if (const Row* row = findRow(word)) {
+    if (deviceManager == nullptr && row->needs == Needs::manager)
+      return Messages::failure("There is no device manager for %s.\n", word.data());
+    return row->action(*this, *args, line);
+  }
+  // Deliberate: words that begin with F fail without a message.
   if (firstLetter(word) == 'f') return false;
   return Messages::failure("Unknown operation %s\n", word.data());
 }

@@ -6,8 +6,14 @@
 
 namespace {
 
+/// Lists from the first index up to but not including the last one.
 void list(const std::vector<StringBase>& words, int first, int last) {
-  for (int i = std::max(first, 0); i < last; ++i) Messages::status("%s\n", words[static_cast<std::size_t>(i)]);
+  for (int i = first; i < last; ++i) Messages::status("%s\n", words[static_cast<std::size_t>(i)]);
+}
+
+bool listAll(const std::vector<StringBase>& words) {
+  list(words, 0, static_cast<int>(words.size()));
+  return true;
 }
 
 void usage(const char* word) {
@@ -21,27 +27,20 @@ void usage(const char* word) {
 }  // namespace
 
 bool CmdParser::help(UT_CMDARGS& args) {
-  const bool listAll = args.findsw("-all");
-  if (const auto* word = args.getsw("-m", 0); word != nullptr && !listAll) {
+  if (args.findsw("-all")) return listAll(TesselCmdargs::findAllCommands());
+  if (const auto* word = args.getsw("-m", 0)) {
     usage(word->getargtxt(0));
     return true;
   }
-  const auto* text = args.getsw("-c", 0);
-  if (text != nullptr && !listAll) {
-    const auto words = TesselCmdargs::findMatchingCommands(text->getargtxt(0));
-    list(words, 0, static_cast<int>(words.size()));
-    return true;
-  }
+  if (const auto* text = args.getsw("-c", 0)) return listAll(TesselCmdargs::findMatchingCommands(text->getargtxt(0)));
   const auto words = TesselCmdargs::findAllCommands();
   const int size = static_cast<int>(words.size());
-  const auto* head = args.getsw("-head", 0);
+  if (const auto* head = args.getsw("-head", 0)) {
+    list(words, 0, std::min<int>(head->getargnum(0), size));
+    return true;
+  }
   const auto* tail = args.getsw("-tail", 0);
-  int first = 0;
-  int last = size;
-  if (head != nullptr && !listAll)
-    last = std::min<int>(head->getargnum(0), size);
-  else if (tail != nullptr && !listAll && size > tail->getargnum(0))
-    first = size - tail->getargnum(0);  // beyond the end for a negative number
-  list(words, first, last);
+  if (tail == nullptr || size <= tail->getargnum(0)) return listAll(words);
+  list(words, size - tail->getargnum(0), size);  // beyond the end for a negative number
   return true;
 }

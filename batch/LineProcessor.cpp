@@ -2,6 +2,7 @@
 #include "batch/Interrupts.h"
 #include "batch/Messages.h"
 #include "batch/Record.h"
+#include "interfaces/portability/UT_PATH.h"
 #include "interfaces/portability/UT_STR.h"
 #include "interfaces/utility/TesselCmdargs.h"
 
@@ -94,8 +95,4 @@ bool CmdParser::recordAndTokenise(const char* line, CommandSet& command) {
   return CommandSet::string2CommandSet(line, command);
 }
 
-const char* baseName(const char* path) {
-  const char* place = path + UT_STR::Len(path);
-  while (place != path && place[-1] != '/' && place[-1] != '\\') --place;
-  return place;
-}
+const char* baseName(const char* path) { return UT_PATH::GetTail(path); }

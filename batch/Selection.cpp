@@ -15,7 +15,8 @@ bool selectDesign(CmdParser& session, int version) {
   return session.deviceManager->setCurrentDesign(version) || failure("Design %d does not exist.\n", version);
 }
 
-bool isContentMode(const CmdParser& session) {
-  const tESSELNS::MODE_TYPE mode = session.deviceManager->getActiveMode();
+bool isContentMode(tESSELNS::MODE_TYPE mode) {
   return mode == tESSELNS::SYSTEM_OBA_CF || mode == tESSELNS::SYSTEM_OBA_MPM || mode == tESSELNS::PROM_FILE_FORMATTER;
 }
+
+bool isContentMode(const CmdParser& session) { return isContentMode(session.deviceManager->getActiveMode()); }

@@ -10,5 +10,7 @@ bool selectCollection(CmdParser& session, const UT_CMDSWINFO* collection);
 /// Makes a design the current one. False after a message.
 bool selectDesign(CmdParser& session, int version);
 
-/// Whether the active mode is one of the three that hold content.
+/// Whether a mode is one of the three that hold content.
+bool isContentMode(tESSELNS::MODE_TYPE mode);
+/// Whether the active mode is one of them.
 bool isContentMode(const CmdParser& session);

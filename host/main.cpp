@@ -14,10 +14,11 @@ void printWords() {
   for (const StringBase& word : TesselCmdargs::findAllCommands()) std::printf("%s\n", word.c_str());
 }
 
-int run(const std::string& file, bool log) {
+/// `file` is null for the console.
+int run(const char* file, bool log) {
   CmdParser session;
   session.setMsgWrite(log);
-  const bool result = file.empty() ? session.runCommandLine() : session.runCommandFile(file.c_str());
+  const bool result = file == nullptr ? session.runCommandLine() : session.runCommandFile(file);
   return result ? succeeded : failed;
 }
 
@@ -33,7 +34,8 @@ int main(int argc, char** argv) {
   std::string file;
   bool noLog = false;
   bool words = false;
-  app.add_option("FILE", file, "Command file to run, - for standard input; without it commands come from the prompt");
+  const CLI::Option* fileOption = app.add_option(
+      "FILE", file, "Command file to run, - for standard input; without it commands come from the prompt");
   app.add_flag("--no-log", noLog, "Keep no batch log (_tesselbatch.log)");
   app.add_flag("--words", words, "Print the command words and leave");
   app.set_version_flag("--version", "tessel " TESSEL_VERSION);
@@ -46,5 +48,5 @@ int main(int argc, char** argv) {
     printWords();
     return succeeded;
   }
-  return run(file, !noLog);
+  return run(fileOption->count() > 0 ? file.c_str() : nullptr, !noLog);
 }

@@ -32,6 +32,15 @@ const char* textAt(const std::vector<std::string>& texts, int index) {
   return index >= 0 && place < texts.size() ? texts[place].c_str() : nullptr;
 }
 
+/// A text of the file as it may stand in a message: short, and without control characters.
+std::string shown(std::string_view text) {
+  constexpr std::size_t longest = 40;
+  std::string result(text.substr(0, longest));
+  for (char& character : result)
+    if (static_cast<unsigned char>(character) < ' ' || character == 0x7F) character = '?';
+  return text.size() > longest ? result + "..." : result;
+}
+
 /// Issues the read error; `line` is 0 when the file as a whole is meant.
 bool fail(const std::string& path, int line, const std::string& reason) {
   const std::string place = line == 0 ? path : path + ":" + std::to_string(line);
@@ -78,14 +87,14 @@ std::string Pdr::takeLine(const std::string& keyword, const std::string& value, 
     return nullptr;
   }();
   if (field == nullptr && !is("MODE") && !is("PROM") && !is("DESIGN") && !is("DEVICE"))
-    return "unknown keyword " + keyword +
+    return "unknown keyword " + shown(keyword) +
            ", expected MODE, FILE_FORMAT, SWAP_BIT, FILL_VALUE, DIRECTION, PROM, DESIGN or DEVICE";
   if (value.empty()) return keyword + " has no value";
   if (field != nullptr) {
     *field = value;
   } else if (is("MODE")) {
     const auto layout = layoutOf(value);
-    if (!layout) return "unknown MODE " + value + ", expected a layout such as pffserial or pffparallel";
+    if (!layout) return "unknown MODE " + shown(value) + ", expected a layout such as pffserial or pffparallel";
     mode_ = *layout;
     modeSeen = true;
   } else if (is("PROM")) {
@@ -93,7 +102,7 @@ std::string Pdr::takeLine(const std::string& keyword, const std::string& value, 
   } else if (is("DESIGN")) {
     designs_.push_back({value, {}});
   } else if (designs_.empty()) {
-    return "DEVICE " + value + " stands before any DESIGN";
+    return "DEVICE " + shown(value) + " stands before any DESIGN";
   } else {
     designs_.back().devices.push_back(value);
   }

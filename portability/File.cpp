@@ -11,6 +11,12 @@ namespace Port {
 
 namespace {
 
+/// Two names of one file, which can't be read and written at once.
+bool isSame(const char* from, const char* to) {
+  std::error_code error;
+  return std::filesystem::equivalent(from, to, error);
+}
+
 /// Copies everything from one descriptor to another and closes both (-1 counts as a failure).
 bool pump(int from, int to) {
   int error = from < 0 || to < 0 ? EIO : 0;
@@ -54,11 +60,13 @@ bool File::remove(const char* path) {
 }
 
 bool File::copy(const char* from, const char* to) {
+  if (isSame(from, to)) return false;
   const int source = Descriptor::openForReading(from);
   return source >= 0 && pump(source, Descriptor::openForWriting(to));
 }
 
 bool File::append(const char* from, const char* to) {
+  if (isSame(from, to)) return false;
   const int source = Descriptor::openForReading(from);
   return source >= 0 && pump(source, Descriptor::openForWriting(to, true));
 }

@@ -75,11 +75,21 @@ void Port_MsgDispatcher::dispatch(MsgType type, const char* productTag, const st
   if (state().observer) state().observer(type, text);
   if (type == MsgType::debug) return;
   const bool tagged = type == MsgType::error || type == MsgType::warning;
-  const std::wstring wide = UT_STR::MbstrToWstr((tagged ? std::string(productTag) + " - " + text : text).c_str());
+  std::string shown = tagged ? std::string(productTag) + " - " + text : text;
+  // A zero byte out of a file must not cut the message.
+  std::replace(shown.begin(), shown.end(), '\0', '?');
+  const std::wstring wide = UT_STR::MbstrToWstr(shown.c_str());
   std::vector<Port_MsgManDefault*> receivers = state().managers;
   if (receivers.empty()) receivers.push_back(state().inCharge());
-  for (auto manager = receivers.begin(); manager != receivers.end(); ++manager)
-    if (std::find(receivers.begin(), manager, *manager) == manager) (*manager)->msgWrite(type, wide.c_str());
+  const auto stillThere = [](Port_MsgManDefault* manager) {
+    const auto& managers = state().managers;
+    return manager == state().builtIn || std::find(managers.begin(), managers.end(), manager) != managers.end();
+  };
+  for (auto manager = receivers.begin(); manager != receivers.end(); ++manager) {
+    // Each once, and none that another one has taken off the list meanwhile.
+    const bool first = std::find(receivers.begin(), manager, *manager) == manager;
+    if (first && stillThere(*manager)) (*manager)->msgWrite(type, wide.c_str());
+  }
 }
 
 Port_MsgManData Port_MsgManData::createObject(const char* productTag, const char* sourceFile, int line,

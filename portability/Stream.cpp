@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
+#include "interfaces/portability/Secret.h"
 #include "portability/Descriptor.h"
 
 namespace Port {
@@ -23,12 +24,30 @@ Stream::Stream(std::string path, int descriptor, bool writing, bool ownsDescript
 Stream::~Stream() { close(); }
 
 bool Stream::fill() {
-  begin_ = end_ = 0;
-  const long count = Descriptor::read(descriptor_, buffer_.data(), buffer_.size(), error_);
-  end_ = count > 0 ? static_cast<std::size_t>(count) : 0;
-  if (std::memchr(buffer_.data(), '\0', end_) != nullptr)
-    std::replace(buffer_.data(), buffer_.data() + end_, '\0', substitute);
-  return end_ > 0;
+  // What is not yet taken moves to the front; at most a look-ahead of one byte.
+  std::copy(buffer_.data() + begin_, buffer_.data() + end_, buffer_.data());
+  end_ -= begin_;
+  begin_ = wiped_ = 0;
+  char* const free = buffer_.data() + end_;
+  const long count = Descriptor::read(descriptor_, free, buffer_.size() - end_, error_);
+  if (count <= 0) return false;
+  end_ += static_cast<std::size_t>(count);
+  if (std::memchr(free, '\0', static_cast<std::size_t>(count)) != nullptr)
+    std::replace(free, free + count, '\0', substitute);
+  return true;
+}
+
+bool Stream::takeLineEnd() {
+  for (const std::string_view lineEnd : {std::string_view("\n"), std::string_view("\r\n")}) {
+    std::size_t matched = 0;
+    while (matched < lineEnd.size() && (begin_ + matched < end_ || fill()) &&
+           buffer_[begin_ + matched] == lineEnd[matched])
+      ++matched;
+    if (matched < lineEnd.size()) continue;
+    begin_ += matched;
+    return true;
+  }
+  return false;
 }
 
 bool Stream::readline(Stream& stream, char* buffer, int size) {
@@ -36,24 +55,30 @@ bool Stream::readline(Stream& stream, char* buffer, int size) {
   std::size_t length = 0;
   bool any = false;
   bool ended = false;
-  while (!ended) {
+  while (!ended && length < room) {
     if (stream.begin_ == stream.end_ && !stream.fill()) break;
     any = true;
     const char* from = stream.buffer_.data() + stream.begin_;
-    // One more than fits, so that a line of exactly the buffer's length takes its line end along.
-    const std::size_t wanted = std::min(stream.end_ - stream.begin_, room - length + 1);
+    const std::size_t wanted = std::min(stream.end_ - stream.begin_, room - length);
     const auto* lineEnd = static_cast<const char*>(std::memchr(from, '\n', wanted));
     ended = lineEnd != nullptr;
-    const std::size_t taken = ended ? static_cast<std::size_t>(lineEnd - from) : std::min(wanted, room - length);
+    const std::size_t taken = ended ? static_cast<std::size_t>(lineEnd - from) : wanted;
     std::memcpy(buffer + length, from, taken);
     length += taken;
     stream.begin_ += taken + (ended ? 1 : 0);
-    if (!ended && taken < wanted) break;
   }
-  if (!any) return false;
+  // A line of exactly the buffer's length takes its line end along.
+  if (!ended && length == room) ended = stream.takeLineEnd();
+  // A line that a read error cuts off is no line.
+  if (!any || stream.error_ != 0) return false;
   if (ended && length > 0 && buffer[length - 1] == '\r') --length;
   buffer[length] = '\0';
   return true;
+}
+
+void Stream::wipeRead() {
+  Secret::wipe(buffer_.data() + wiped_, begin_ - wiped_);
+  wiped_ = begin_;
 }
 
 Stream& Stream::write(std::string_view text) {

@@ -4,6 +4,7 @@
 #include <memory>
 #include <type_traits>
 
+#include "interfaces/portability/Secret.h"
 #include "interfaces/portability/UT_STR.h"
 
 std::int32_t UT_CMDARGINFO::getargnum32() const { return UT_STR::AToL(text_); }
@@ -22,7 +23,8 @@ UT_CMDARGS::UT_CMDARGS(int count, const char* const* words) {
   }
   const std::size_t switchBytes = switchCount * sizeof(UT_CMDSWINFO);
   const std::size_t argumentBytes = all.size() * sizeof(UT_CMDARGINFO);
-  memory_ = std::make_unique_for_overwrite<std::byte[]>(switchBytes + argumentBytes + textSize);
+  memorySize_ = switchBytes + argumentBytes + textSize;
+  memory_ = std::make_unique_for_overwrite<std::byte[]>(memorySize_);
   auto* const switches = reinterpret_cast<UT_CMDSWINFO*>(memory_.get());
   auto* const arguments = reinterpret_cast<UT_CMDARGINFO*>(memory_.get() + switchBytes);
   auto* text = reinterpret_cast<char*>(memory_.get() + switchBytes + argumentBytes);
@@ -53,6 +55,14 @@ UT_CMDARGS::UT_CMDARGS(int count, const char* const* words) {
   }
   closeSwitch();
   switches_ = {switches, nextSwitch};
+}
+
+UT_CMDARGS::~UT_CMDARGS() {
+  for (const UT_CMDSWINFO& each : switches_) {
+    if (!Port::Secret::announces(each.getswname())) continue;
+    Port::Secret::wipe(memory_.get(), memorySize_);
+    return;
+  }
 }
 
 const UT_CMDSWINFO* UT_CMDARGS::getsw(int index) const {

@@ -20,4 +20,6 @@ std::int64_t _time64(std::int64_t* time) {
   return now;
 }
 
-double _difftime64(std::int64_t end, std::int64_t start) { return static_cast<double>(end - start); }
+double _difftime64(std::int64_t end, std::int64_t start) {
+  return static_cast<double>(end) - static_cast<double>(start);
+}

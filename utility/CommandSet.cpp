@@ -6,8 +6,10 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstring>
+#include <functional>
 #include <limits>
 #include <string_view>
+#include <utility>
 
 #include "interfaces/portability/Port_MsgManData.h"
 #include "interfaces/portability/UT_CMDARGS.h"
@@ -64,14 +66,14 @@ CommandSet::CommandSet(const CommandSet& other) { *this = other; }
 
 CommandSet& CommandSet::operator=(const CommandSet& other) {
   if (this == &other) return *this;
-  size_ = 0;
-  words_.clear();
+  clear();
   reserveText(other.size_);
   words_.reserve(other.words_.size());
   if (other.size_ > 0) std::memcpy(text_.get(), other.text_.get(), other.size_);
   for (const char* word : other.words_) words_.push_back(moved(word, other.text_.get(), text_.get()));
   size_ = other.size_;
   converted_ = other.converted_;
+  holdsKey_ = other.holdsKey_;
   return *this;
 }
 
@@ -81,6 +83,7 @@ void CommandSet::reserveText(std::size_t size) {
   auto text = std::make_unique_for_overwrite<char[]>(capacity);
   if (size_ > 0) std::memcpy(text.get(), text_.get(), size_);
   for (const char*& word : words_) word = moved(word, text_.get(), text.get());
+  wipe();
   text_ = std::move(text);
   capacity_ = capacity;
 }
@@ -103,11 +106,29 @@ bool CommandSet::string2CommandSet(const char* line, CommandSet& set) {
   if (place == end)
     set.words_.push_back(emptyWord);
   else if (!set.splitWords(place, end))
-    message(__LINE__).issueWarning("Missing closing quote, the text ends with the line: %s\n", std::string(line, end));
+    // Without the text: it may hold a key.
+    message(__LINE__).issueWarning("Missing closing quote, the text ends with the line.\n");
   return true;
 }
 
+void CommandSet::noteKey(const char* word) {
+  if (!Port::Secret::announces(word)) return;
+  holdsKey_ = true;
+  Port::Secret::forbidCoreDump();
+}
+
+void CommandSet::swap(CommandSet& other) noexcept {
+  text_.swap(other.text_);
+  std::swap(size_, other.size_);
+  std::swap(capacity_, other.capacity_);
+  words_.swap(other.words_);
+  std::swap(converted_, other.converted_);
+  std::swap(holdsKey_, other.holdsKey_);
+}
+
 void CommandSet::clear() {
+  wipe();
+  holdsKey_ = false;
   size_ = 0;
   words_.clear();
   converted_ = false;
@@ -135,6 +156,7 @@ bool CommandSet::splitWords(const char* place, const char* end) {
         *out++ = *place;
     }
     *out++ = '\0';
+    noteKey(words_.back());
     place = skipBlanks(place, end);
   }
   size_ = static_cast<std::size_t>(out - text_.get());
@@ -147,12 +169,17 @@ void CommandSet::addCommand(const char* word) {
     return;
   }
   const std::size_t size = std::strlen(word) + 1;
-  // The word may be one of this set's own.
-  const std::string copy(capacity_ - size_ < size ? word : "");
+  // The word may be one of this set's own, which moves with the rest.
+  const char* const begin = text_.get();
+  const std::less<const char*> before;
+  const bool own = begin != nullptr && !before(word, begin) && before(word, begin + size_);
+  const std::ptrdiff_t place = own ? word - begin : 0;
   reserveText(size);
+  if (own) word = text_.get() + place;
   words_.push_back(text_.get() + size_);
-  std::memcpy(text_.get() + size_, copy.empty() ? word : copy.c_str(), size);
+  std::memcpy(text_.get() + size_, word, size);
   size_ += size;
+  noteKey(words_.back());
 }
 
 void CommandSet::addCommand(int number) { addCommand(std::to_string(number).c_str()); }

@@ -19,7 +19,8 @@ bool isFull(std::string_view path) {
 StringBase FileUtility::convertPath(const StringBase& path, const StringBase& base) {
   if (isFull(path.view())) return path;
   StringBase full = base.empty() ? Port::File::getcwd() : base;
-  if (full.empty() || !isSeparator(full.view().back())) full += '/';
+  if (full.empty()) full = StringBase(".");  // the current directory was removed
+  if (!isSeparator(full.view().back())) full += '/';
   full += path.view();
   return full;
 }

@@ -1,6 +1,8 @@
 #include "interfaces/utility/TesselCmdargs.h"
 
+#include <algorithm>
 #include <string>
+#include <string_view>
 
 #include "interfaces/portability/Port_MsgManData.h"
 #include "interfaces/portability/UT_STR.h"
@@ -28,6 +30,11 @@ const Switch* findSwitch(const Command& command, const char* name) {
   return found != nullptr ? found : findSwitch(command.own, name);
 }
 
+/// A word as it may stand in a message: one of a command that takes a key may be the key, mistyped.
+const char* shown(const Command& command, const char* word) {
+  return findSwitch(command, "-key") == nullptr ? word : "(not shown)";
+}
+
 std::string switchNames(const Command& command) {
   std::string names;
   for (const auto& switches : {command.common, command.own})
@@ -51,13 +58,16 @@ void checkSwitch(const Command& command, const Switch& row, const UT_CMDSWINFO& 
   if (given.getnumargs() < row.least)
     reject("Switch %s of %s needs its argument: %s. Try help -m %s.", given.getswname(), command.word, row.argument,
            command.word);
+  // Not the number itself: positions are 0-based by now, the user counts from 1.
+  if (given.getnumargs() > row.most && row.kind == Kind::number)
+    reject("Switch %s of %s takes one number. Try help -m %s.", given.getswname(), command.word, command.word);
   if (given.getnumargs() > row.most)
-    reject("Unexpected word %s after switch %s of %s. Try help -m %s.", given.getargtxt(row.most), given.getswname(),
-           command.word, command.word);
+    reject("Unexpected word %s after switch %s of %s. Try help -m %s.", shown(command, given.getargtxt(row.most)),
+           given.getswname(), command.word, command.word);
   for (int i = 0; i < given.getnumargs(); ++i)
     if (wantsNumber(row, i) && !isNumber(given.getargtxt(i)))
       reject("Switch %s of %s takes a number, not %s. Try help -m %s.", given.getswname(), command.word,
-             given.getargtxt(i), command.word);
+             shown(command, given.getargtxt(i)), command.word);
 }
 
 void check(const Command& command, const UT_CMDARGS& given, const char* firstWord) {
@@ -65,13 +75,13 @@ void check(const Command& command, const UT_CMDARGS& given, const char* firstWor
   static constexpr Switch freeSwitch = optionalText("", "", "");
   if (command.switches == Switches::anything) return;
   if (given.getnumargs() > 0)
-    reject("Unexpected word %s after %s: a switch begins with -. Try help -m %s.", firstWord, command.word,
-           command.word);
+    reject("Unexpected word %s after %s: a switch begins with -. Try help -m %s.", shown(command, firstWord),
+           command.word, command.word);
   for (int i = 0; i < given.getnumsw(); ++i) {
     const UT_CMDSWINFO& each = *given.getsw(i);
     const Switch* row = command.switches == Switches::anyName ? &freeSwitch : findSwitch(command, each.getswname());
     if (row == nullptr)
-      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", each.getswname(), command.word,
+      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", shown(command, each.getswname()), command.word,
              switchNames(command), command.word);
     checkSwitch(command, *row, each);
   }
@@ -98,10 +108,14 @@ std::unique_ptr<UT_CMDARGS> TesselCmdargs::getCmdargs(int count, const char* con
 std::vector<StringBase> TesselCmdargs::findAllCommands() { return findMatchingCommands(""); }
 
 std::vector<StringBase> TesselCmdargs::findMatchingCommands(const char* text) {
-  const std::string pattern = "*" + std::string(text) + "*";
+  const std::string wanted = text;
+  const auto sameLetter = [](char a, char b) { return UT_STR::Lower(a) == UT_STR::Lower(b); };
   std::vector<StringBase> words;
-  for (const Command* command : CommandTable::all())
-    if (UT_STR::IMatch(command->word, pattern.c_str())) words.emplace_back(command->word);
+  for (const Command* command : CommandTable::all()) {
+    const std::string_view word = command->word;
+    const auto found = std::search(word.begin(), word.end(), wanted.begin(), wanted.end(), sameLetter);
+    if (found != word.end() || wanted.empty()) words.emplace_back(command->word);
+  }
   return words;
 }
 

@@ -10,13 +10,13 @@ struct Row {
   const char* name;
   const char* initial;
   const char* expected;
-  bool isNumber;
+  int least;  ///< of a number; -1 for a preference that is true or false
 };
 /// In the order of the enumeration.
 constexpr Row rows[TesselPreference::count] = {
-    {"lineWidth", "0", "a number of columns, 0 for no wrapping", true},
-    {"recordSteps", "true", "true or false", false},
-    {"cableLockTries", "1", "a number of tries, 1 or more", true},
+    {"lineWidth", "0", "a number of columns, 0 for no wrapping", 0},
+    {"recordSteps", "true", "true or false", -1},
+    {"cableLockTries", "1", "a number of tries, 1 or more", 1},
 };
 
 const Row* rowOf(TesselPreference::PREFERENCE preference) {
@@ -24,11 +24,11 @@ const Row* rowOf(TesselPreference::PREFERENCE preference) {
 }
 
 bool accepts(const Row& row, const char* value) {
-  if (!row.isNumber) return UT_STR::ICompare(value, "true") == 0 || UT_STR::ICompare(value, "false") == 0;
+  if (row.least < 0) return UT_STR::ICompare(value, "true") == 0 || UT_STR::ICompare(value, "false") == 0;
   if (*value == '\0') return false;
   for (const char* digit = value; *digit != '\0'; ++digit)
     if (*digit < '0' || *digit > '9') return false;
-  return true;
+  return UT_STR::AToI(value) >= row.least;
 }
 
 }  // namespace

@@ -3,6 +3,7 @@
 #include "batch/CmdParser.h"
 #include "batch/Files.h"
 #include "batch/Messages.h"
+#include "batch/Selection.h"
 #include "batch/chain/ExtraFiles.h"
 #include "batch/chain/Position.h"
 #include "batch/chain/ProgrammingFiles.h"
@@ -102,9 +103,7 @@ bool readCsPin(const UT_CMDARGS& args, tESSELNS::MODE_TYPE mode, CsPin& pin) {
 bool CmdParser::addDevice(UT_CMDARGS& args) {
   if (!checkModeSet()) return false;
   const tESSELNS::MODE_TYPE mode = deviceManager->getActiveMode();
-  const bool hasContent =
-      mode == tESSELNS::SYSTEM_OBA_MPM || mode == tESSELNS::PROM_FILE_FORMATTER || mode == tESSELNS::SYSTEM_OBA_CF;
-  if (hasContent && !checkChainContents(mode)) return false;
+  if (isContentMode(mode) && !checkChainContents(mode)) return false;
   Request request{*this, args, nullptr, -1, {}};
   if (!positionToAdd(*this, args, request.position)) return false;
   if (!readCsPin(args, mode, request.csPin)) return false;

@@ -24,6 +24,7 @@ bool isReserved(const char* name) {
 bool CmdParser::addCollection(UT_CMDARGS& args) {
   if (!checkModeSet()) return false;
   const tESSELNS::MODE_TYPE mode = deviceManager->getActiveMode();
+  deviceManager->getSubmode();  // device managers may count on being asked; the answer plays no part
   const UT_CMDSWINFO* given = args.getsw("-name", 0);
   if (given == nullptr) return failure("Name of the collection is required.\n");
   const char* name = given->getargtxt(0);

@@ -11,7 +11,7 @@ using Messages::failure;
 bool CmdParser::addDesign(UT_CMDARGS& args) {
   if (!checkModeSet()) return false;
   const tESSELNS::MODE_TYPE mode = deviceManager->getActiveMode();
-  if (!isContentMode(*this)) return false;
+  if (!isContentMode(mode)) return false;
   const UT_CMDSWINFO* version = findSwitch(args, "-version", "-v");
   if (version == nullptr) return failure("Design number is required.\n");
   const UT_CMDSWINFO* given = findSwitch(args, "-name", "-designname", "-startaddress");

@@ -40,8 +40,9 @@ bool readParallelProm(const UT_CMDARGS& args, Prom& prom) {
   const UT_CMDSWINFO* size = args.getsw("-size", 0);
   if (size == nullptr) return failure("Option -size is required for pff parallel mode.\n");
   if (args.findsw("-name")) Messages::warning("Option -name is not used for pff parallel mode, setting is ignored.\n");
-  prom.size = static_cast<std::uint32_t>(size->getargnum32(0));
-  prom.name = Port::format("%dk", size->getargnum32(0));
+  const std::int32_t number = size->getargnum32(0);
+  prom.size = static_cast<std::uint32_t>(number);
+  prom.name = Port::format("%dk", number);
   return true;
 }
 
@@ -65,10 +66,11 @@ bool CmdParser::addConfigDevice(UT_CMDARGS& args) {
 }
 
 bool CmdParser::deleteConfigDevice(UT_CMDARGS& /*args*/) {
-  if (!isContentMode(*this))
+  const tESSELNS::MODE_TYPE mode = deviceManager->getActiveMode();
+  if (!isContentMode(mode))
     return failure(
         "You can only delete a configuration device in SystemOBA CF, SystemOBA MPM or Prom File Formatter mode.\n");
-  deviceManager->clearMode(deviceManager->getActiveMode());
+  deviceManager->clearMode(mode);
   return true;
 }
 

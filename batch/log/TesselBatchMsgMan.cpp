@@ -29,8 +29,9 @@ StringBase defaultLog() {
 }  // namespace
 
 TesselBatchMsgMan::TesselBatchMsgMan(const char* logName) : Port_MsgManDefault(nullptr), defaultLogPath(defaultLog()) {
-  if (!UT_STR::IMatch(logName, "default")) userLogPath = StringBase(logName);
-  logStream = openLog(userLogPath.empty() ? defaultLogPath : userLogPath);
+  const bool isDefault = UT_STR::IMatch(logName, "default");
+  if (!isDefault) userLogPath = StringBase(logName);
+  logStream = openLog(isDefault ? defaultLogPath : userLogPath);
   writeBanner();
 }
 
@@ -54,7 +55,7 @@ void TesselBatchMsgMan::msgWrite(MsgType type, const wchar_t* text) {
   int count = 0;
   std::vector<std::wstring> lines = msgFormat(type, getClean(), getMaxLineWidth(), text, &count);
   StringBase shown;
-  for (const std::wstring& line : lines) shown += UT_STR::WstrToMbstr(line.c_str());
+  for (int i = 0; i < count; ++i) shown += UT_STR::WstrToMbstr(lines[static_cast<std::size_t>(i)].c_str());
   UT_STR::WDelStrings(lines, count);
   if (logStream == nullptr) return;
   if (shown.GetIndexOfString("\n", 0) < 0) {
@@ -80,9 +81,16 @@ void TesselBatchMsgMan::copyToUserLog() {
 void TesselBatchMsgMan::installBatchLog(const char* logName) {
   if (theBatchMsgMan == nullptr) theBatchMsgMan = std::make_unique<TesselBatchMsgMan>(logName);
   previousMsgMan = Port_MsgDispatcher::getDefaultMsgMan();
+  theBatchMsgMan->setMaxLineWidth(previousMsgMan->getMaxLineWidth());
   Port_MsgDispatcher::addMsgMan(theBatchMsgMan.get());
   Port_MsgDispatcher::removeMsgMan(previousMsgMan);
   logFreshFlag = 1;
 }
 
-void TesselBatchMsgMan::removeBatchLog() { theBatchMsgMan.reset(); }
+void TesselBatchMsgMan::removeBatchLog() {
+  if (theBatchMsgMan == nullptr) return;
+  const int width = theBatchMsgMan->getMaxLineWidth();
+  theBatchMsgMan.reset();
+  // A line width that was set meanwhile stays in force.
+  Port_MsgDispatcher::getDefaultMsgMan()->setMaxLineWidth(width);
+}

@@ -9,7 +9,8 @@
 
 /// The message manager of batch use: every message is shown as usual and also written, as shown, into a
 /// log file. At most one exists in the process; it stands in the dispatcher in place of the manager that
-/// was there before. Failures of the log's file are silent: messages go on being shown.
+/// was there before, which must not be destroyed meanwhile. Failures of the log's file are silent: messages go on being
+/// shown.
 class TesselBatchMsgMan : public Port_MsgManDefault {
  public:
   /// Starts the log afresh: in `_tesselbatch.log` of the current directory for the name "default" (in any
@@ -37,5 +38,5 @@ class TesselBatchMsgMan : public Port_MsgManDefault {
   StringBase defaultLogPath;
 };
 
-/// Set when the batch log is put in place, cleared by every message; for the host's debugger.
+/// Set when the batch log is put in place, cleared by every message it gets.
 extern std::atomic<unsigned char> logFreshFlag;

@@ -106,10 +106,11 @@ void appendFilled(CommandSet& words, const std::vector<StringBase>& options) {
 void appendOptions(DeviceManagerInterface& manager, const Target& target, CommandSet& words) {
   const tESSELNS::MODE_TYPE mode = manager.getActiveMode();
   const DeviceOptionsMgr& options = *manager.getDeviceOptionsMgr(mode, target.position, false);
+  const bool onlyFpga = options.isOptionSet(U_OptionsMgr::onlyFpga);
   const bool takesOptions =
       mode == tESSELNS::BOUNDARY_SCAN || mode == tESSELNS::DESKTOP_CONFIGURATION || mode == tESSELNS::SPI;
   if (isWord(words, "program")) {
-    if (options.isOptionSet(U_OptionsMgr::onlyFpga))
+    if (onlyFpga)
       words.addCommand("-onlyFpga");
     else if (takesOptions && target.attached)
       appendAll(words, manager.getDeviceOptionsMgr(mode, target.position, true)->getProgramOptions(),

@@ -10,7 +10,8 @@ using Messages::failure;
 namespace {
 
 struct ArchivePlace {
-  StringBase file;  ///< without a path
+  StringBase typed;  ///< what -file says
+  StringBase file;   ///< without a path
   StringBase directory;
 };
 
@@ -18,16 +19,17 @@ struct ArchivePlace {
 bool findArchive(const UT_CMDARGS& args, ArchivePlace& place) {
   const UT_CMDSWINFO* given = args.getsw("-file", 0);
   if (given == nullptr) return failure("Archive file name is required.\n");
-  const StringBase file = given->getargtxt(0);
-  place.file = FileUtility::getTail(file);
+  place.typed = StringBase(given->getargtxt(0));
+  place.file = FileUtility::getTail(place.typed);
   const UT_CMDSWINFO* directory = args.getsw("-dir", 0);
   if (directory == nullptr) {
-    place.directory = FileUtility::getHead(FileUtility::convertPath(file, StringBase()));
+    place.directory = FileUtility::getHead(FileUtility::convertPath(place.typed, StringBase()));
     return true;
   }
+  if (UT_STR::ICompare(place.file.c_str(), place.typed.c_str()) != 0)
+    return failure("Both -file and -dir switches are used.\nPlease exclude path name for switch -file.\n");
   place.directory = StringBase(directory->getargtxt(0));
-  return UT_STR::ICompare(place.file.c_str(), file.c_str()) == 0 ||
-         failure("Both -file and -dir switches are used.\nPlease exclude path name for switch -file.\n");
+  return true;
 }
 
 }  // namespace
@@ -46,5 +48,5 @@ bool CmdParser::loadArchive(UT_CMDARGS& args) {
   ArchivePlace place;
   if (!findArchive(args, place)) return false;
   return deviceManager->loadArchive(place.file, place.directory) ||
-         failure("Error opening archive file , %s\n", args.getsw("-file", 0)->getargtxt(0));
+         failure("Error opening archive file , %s\n", place.typed);
 }

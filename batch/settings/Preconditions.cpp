@@ -1,5 +1,6 @@
 #include "batch/CmdParser.h"
 #include "batch/Messages.h"
+#include "batch/Selection.h"
 #include "interfaces/devicemanager/DeviceManagerInterface.h"
 
 using Messages::failure;
@@ -27,10 +28,7 @@ bool CmdParser::checkIdentify() const {
 bool CmdParser::isActiveMode(tESSELNS::MODE_TYPE mode) const { return deviceManager->getActiveMode() == mode; }
 
 bool CmdParser::checkFormatterMode() const {
-  const tESSELNS::MODE_TYPE mode = deviceManager->getActiveMode();
-  const bool formatter =
-      mode == tESSELNS::SYSTEM_OBA_CF || mode == tESSELNS::SYSTEM_OBA_MPM || mode == tESSELNS::PROM_FILE_FORMATTER;
-  return formatter || failure("Mode has to be either CF, MPM or PFF\n");
+  return isContentMode(*this) || failure("Mode has to be either CF, MPM or PFF\n");
 }
 
 bool CmdParser::checkChainContents(tESSELNS::MODE_TYPE mode) const {

@@ -66,8 +66,9 @@ class TESSEL_EXPORT DeviceManagerInterface {
   /// file cable writes, or null for a port word that names no cable. `port` is the port's index, -1 for
   /// none; `baud` is in bits per second, -1 for automatic or not applicable; `server` is a host name or null.
   virtual bool setCable(const char* type, int port, int baud, bool open, const char* server, bool quiet) = 0;
-  /// Takes the cable lock; false when another user holds the cable.
-  virtual bool lockCable(int tries) = 0;
+  /// Takes the cable lock; false when another user holds the cable. Sessions ask with the number 5, whose
+  /// meaning is the device manager's; the bundled one has one lock and does not look at it.
+  virtual bool lockCable(int kind) = 0;
   virtual bool unlockCable() = 0;
   /// `final` is true at the end of a session.
   virtual bool closeCable(bool final) = 0;
@@ -133,6 +134,7 @@ class TESSEL_EXPORT DeviceManagerInterface {
   virtual bool addCollection(const char* name) = 0;
   virtual bool removeCollection(const char* name) = 0;
   virtual bool renameCollection(const char* oldName, const char* newName) = 0;
+  /// `name` is null when the command's switch had no argument.
   virtual bool setCurrentCollection(const char* name) = 0;
   /// Empty or null when there is no current collection.
   virtual const char* getCurrentCollectionName() = 0;

@@ -26,6 +26,7 @@ class TESSEL_EXPORT File {
   static bool probe(const char* path);
 
   static bool remove(const char* path);
+  /// False, and nothing happens, when both are one file; so with `append`.
   static bool copy(const char* from, const char* to);
   /// Adds the content of `from` to the end of `to`, which is made when missing.
   static bool append(const char* from, const char* to);

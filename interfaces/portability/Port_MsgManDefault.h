@@ -1,5 +1,6 @@
 #pragma once
 
+#include <atomic>
 #include <cstdio>
 #include <string>
 #include <vector>
@@ -44,7 +45,8 @@ class TESSEL_EXPORT Port_MsgManDefault {
 
  private:
   std::string name_;
-  bool clean_ = false;
-  bool abort_ = false;
-  int maxLineWidth_ = 0;
+  // Set by the session's thread, read by whichever thread issues a message.
+  std::atomic<bool> clean_ = false;
+  std::atomic<bool> abort_ = false;
+  std::atomic<int> maxLineWidth_ = 0;
 };

@@ -33,6 +33,9 @@ class TESSEL_EXPORT Stream {
   /// Hands everything written so far to the system.
   Stream& flush();
 
+  /// Wipes what was read so far out of the buffer.
+  void wipeRead();
+
   const std::string& path() const { return path_; }
   /// The system's error number of the first failure of this stream; 0 when there was none.
   int error() const { return error_; }
@@ -40,6 +43,8 @@ class TESSEL_EXPORT Stream {
  private:
   friend class File;
   bool fill();
+  /// Passes over a line end, if one comes next.
+  bool takeLineEnd();
   bool close();
 
   std::string path_;
@@ -50,6 +55,7 @@ class TESSEL_EXPORT Stream {
   std::vector<char> buffer_;
   std::size_t begin_ = 0;
   std::size_t end_ = 0;
+  std::size_t wiped_ = 0;  ///< `wipeRead` was here
 };
 
 /// Ends the line and flushes.

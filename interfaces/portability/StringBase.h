@@ -4,6 +4,7 @@
 #include <cstddef>
 #include <cstdlib>
 #include <cstring>
+#include <functional>
 #include <new>
 #include <string>
 #include <string_view>
@@ -46,7 +47,9 @@ class StringBase {
 
   StringBase& operator+=(View text) {
     if (text.empty()) return *this;
-    if (text.data() >= text_ && text.data() < text_ + size_) return *this += View(std::basic_string<Char>(text));
+    const std::less<const Char*> before;
+    if (!before(text.data(), text_) && before(text.data(), text_ + size_))
+      return *this += View(std::basic_string<Char>(text));
     reserve(size_ + text.size());
     std::memcpy(text_ + size_, text.data(), text.size() * sizeof(Char));
     cut(size_ + text.size());

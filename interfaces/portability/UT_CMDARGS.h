@@ -17,6 +17,8 @@ class TESSEL_EXPORT UT_CMDARGS {
   UT_CMDARGS(int count, const char* const* words);
   UT_CMDARGS(const UT_CMDARGS&) = delete;
   UT_CMDARGS& operator=(const UT_CMDARGS&) = delete;
+  /// Wipes the memory when there is a key in it.
+  ~UT_CMDARGS();
 
   static bool isSwitch(const char* word) {
     return word[0] == '-' && word[1] != '\0' && (word[1] < '0' || word[1] > '9');
@@ -37,6 +39,7 @@ class TESSEL_EXPORT UT_CMDARGS {
  private:
   /// The switches, the arguments and the texts, one behind the other.
   std::unique_ptr<std::byte[]> memory_;
+  std::size_t memorySize_ = 0;
   const char* command_ = "";
   std::span<const UT_CMDSWINFO> switches_;
   std::size_t ownArguments_ = 0;

@@ -6,18 +6,24 @@
 #include <vector>
 
 #include "interfaces/Export.h"
+#include "interfaces/portability/Secret.h"
 
 /// A command line split into words, the command word first. Positions are counted from 1 as typed and
-/// from 0 after `decrementPositions`.
+/// from 0 after `decrementPositions`. The memory of a set that holds a key (behind a `-key` switch) is wiped
+/// when the set is done with it, and from the first such word on the process writes no core dumps.
 class TESSEL_EXPORT CommandSet {
  public:
   /// An empty set with room for `capacity` words.
   explicit CommandSet(int capacity);
   CommandSet(const CommandSet& other);
   CommandSet& operator=(const CommandSet& other);
-  CommandSet(CommandSet&& other) noexcept = default;
-  CommandSet& operator=(CommandSet&& other) noexcept = default;
-  ~CommandSet() = default;
+  /// A set that was moved from may be filled again.
+  CommandSet(CommandSet&& other) noexcept { swap(other); }
+  CommandSet& operator=(CommandSet&& other) noexcept {
+    swap(other);
+    return *this;
+  }
+  ~CommandSet() { wipe(); }
 
   /// Splits a line at blanks and tabs. Double quotes group and are removed; a backslash is an ordinary
   /// character; a line end is stripped; a quote that is not closed ends with the line, after a warning.
@@ -35,6 +41,9 @@ class TESSEL_EXPORT CommandSet {
   /// All words, `getNumberCommands()` of them. Valid until a word is added.
   const char* const* getCommands() const { return words_.data(); }
 
+  /// Whether a word is the `-key` switch.
+  bool holdsKey() const { return holdsKey_; }
+
   void addCommand(const char* word);
   void addCommand(int number);
 
@@ -48,7 +57,13 @@ class TESSEL_EXPORT CommandSet {
   void printCommands(bool echo) const;
 
  private:
+  /// Takes note of a word that announces a key; no core dump is to hold it.
+  void noteKey(const char* word);
+  void swap(CommandSet& other) noexcept;
   void clear();
+  void wipe() {
+    if (holdsKey_ && text_ != nullptr) Port::Secret::wipe(text_.get(), capacity_);
+  }
   /// Makes room for `size` more bytes of text.
   void reserveText(std::size_t size);
   bool splitWords(const char* place, const char* end);
@@ -59,4 +74,5 @@ class TESSEL_EXPORT CommandSet {
   std::size_t capacity_ = 0;
   std::vector<const char*> words_;  ///< into `text_`, but for empty ones
   bool converted_ = false;
+  bool holdsKey_ = false;
 };

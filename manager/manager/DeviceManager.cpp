@@ -38,6 +38,7 @@ bool DeviceManager::setMode(MODE_TYPE mode, bool makeActive) {
     return reportError("There is no mode %d.\n", mode);
   const bool changed = mode_ != mode || (makeActive && activeMode_ != mode);
   mode_ = mode;
+  if (changed) submodeSet_ = false;
   if (makeActive) activeMode_ = mode;
   if (changed) recordStep(Port::format("setMode -%s", keyword(mode)));
   return true;
@@ -46,8 +47,10 @@ bool DeviceManager::setMode(MODE_TYPE mode, bool makeActive) {
 bool DeviceManager::setSubmode(SUBMODE_TYPE submode) {
   const char* name = keyword(activeMode_, submode);
   if (*name == '\0') return reportError("Mode %d has no submode %d.\n", activeMode_, submode);
+  const bool changed = !submodeSet_ || submode_ != submode;
   submode_ = submode;
-  recordStep(Port::format("setSubmode -%s", name));
+  submodeSet_ = true;
+  if (changed) recordStep(Port::format("setSubmode -%s", name));
   return true;
 }
 
@@ -75,12 +78,14 @@ bool DeviceManager::setPreference(TesselPreference::PREFERENCE preference, const
       names += std::string(" ") + TesselPreference::pref2String(static_cast<TesselPreference::PREFERENCE>(i));
     return reportError("Unknown preference. There are:%s.\n", names);
   }
+  const std::string before = preferences.get(preference);
   if (!preferences.set(preference, value))
     return reportError("Preference %s can't be \"%s\", expected %s.\n", TesselPreference::pref2String(preference),
                        value, TesselPreference::expectedValue(preference));
   if (preference == TesselPreference::lineWidth)
     Port_MsgDispatcher::getDefaultMsgMan()->setMaxLineWidth(preferences.getNumber(preference));
-  recordStep(Port::format("setPreference -pref %s:%s", TesselPreference::pref2String(preference), value));
+  if (before != value)
+    recordStep(Port::format("setPreference -pref %s:%s", TesselPreference::pref2String(preference), value));
   return true;
 }
 
@@ -116,7 +121,7 @@ bool DeviceManager::setCable(const char* type, int /*port*/, int /*baud*/, bool 
   return store(cable_, type, "setCable -port null");
 }
 
-bool DeviceManager::lockCable(int /*tries*/) {
+bool DeviceManager::lockCable(int /*kind*/) {
   return cableLock_.lock(TesselPreference::getPreferenceObject().getNumber(TesselPreference::cableLockTries));
 }
 

@@ -27,7 +27,7 @@ class DeviceManager : public DeviceManagerInterface {
   bool setBpiWidth(MODE_TYPE mode, const char* width) override;
 
   bool setCable(const char* type, int port, int baud, bool open, const char* server, bool quiet) override;
-  bool lockCable(int tries) override;
+  bool lockCable(int kind) override;
   bool unlockCable() override;
   bool closeCable(bool final) override;
   int setCableSpeed(int speed) override;
@@ -116,6 +116,7 @@ class DeviceManager : public DeviceManagerInterface {
   MODE_TYPE mode_ = tESSELNS::NO_MODE;
   MODE_TYPE activeMode_ = tESSELNS::NO_MODE;
   SUBMODE_TYPE submode_ = tESSELNS::PFF_SERIAL;
+  bool submodeSet_ = false;  ///< since the mode was chosen
   Target target_;
   Multiboot multiboot_;
   std::string cable_;  ///< the type of the open cable; empty when none is

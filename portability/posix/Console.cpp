@@ -26,5 +26,6 @@ bool Port::Console::readLine(char* buffer, int size) {
   }
   ::funlockfile(stdin);
   buffer[length] = '\0';
-  return length > 0;
+  // A line that a read error cuts off is no line.
+  return length > 0 && std::ferror(stdin) == 0;
 }

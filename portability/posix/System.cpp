@@ -30,6 +30,7 @@ int Descriptor::openForReading(const char* path) {
   struct stat status {};
   if (descriptor < 0 || ::fstat(descriptor, &status) != 0 || !S_ISDIR(status.st_mode)) return descriptor;
   ::close(descriptor);
+  errno = EISDIR;
   return -1;
 }
 

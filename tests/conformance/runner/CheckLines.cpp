@@ -5,18 +5,29 @@
 namespace conformance {
 namespace {
 
+/// A lone `*` as the value of a check.
+bool takesAnything(Check& check, LineCursor& cursor) {
+  if (!cursor.take("*")) return false;
+  check.value = Value(Value::Kind::any);
+  return true;
+}
+
 void readFlag(Check& check, LineCursor& cursor) {
   check.name = cursor.name("the name of a flag");
   if (std::find(flagNames.begin(), flagNames.end(), check.name) == flagNames.end())
     cursor.fail("unknown flag '" + check.name + "'");
+  if (takesAnything(check, cursor)) return;
   check.value = check.name == numberFlag ? Value(Value::Kind::number, cursor.number())
                                          : Value(Value::Kind::boolean, cursor.boolean() ? 1 : 0);
 }
 
-void readTranscript(Check& check, LineCursor& cursor) { check.value = Value(Value::Kind::text, cursor.text()); }
+void readTranscript(Check& check, LineCursor& cursor) {
+  if (!takesAnything(check, cursor)) check.value = Value(Value::Kind::text, cursor.text());
+}
 
 void readEnvironment(Check& check, LineCursor& cursor) {
   check.name = cursor.name("the name of a variable");
+  if (takesAnything(check, cursor)) return;
   check.value = cursor.take("null") ? Value(Value::Kind::null) : Value(Value::Kind::text, cursor.text());
 }
 

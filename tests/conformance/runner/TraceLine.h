@@ -12,7 +12,7 @@ namespace conformance {
 struct TraceLine {
   std::string text;
   std::optional<Event> event;
-  bool anyFileLine = false;  ///< `| *`
+  bool anyEnd = false;  ///< its last character is a `*` that stands for any text
 };
 
 /// True when the actual line is what is expected.
