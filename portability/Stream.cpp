@@ -37,7 +37,7 @@ bool Stream::fill() {
   return true;
 }
 
-bool Stream::takeLineEnd() {
+std::size_t Stream::takeLineEnd() {
   for (const std::string_view lineEnd : {std::string_view("\n"), std::string_view("\r\n")}) {
     std::size_t matched = 0;
     while (matched < lineEnd.size() && (begin_ + matched < end_ || fill()) &&
@@ -45,9 +45,9 @@ bool Stream::takeLineEnd() {
       ++matched;
     if (matched < lineEnd.size()) continue;
     begin_ += matched;
-    return true;
+    return matched;
   }
-  return false;
+  return 0;
 }
 
 bool Stream::readline(Stream& stream, char* buffer, int size) {
@@ -67,8 +67,8 @@ bool Stream::readline(Stream& stream, char* buffer, int size) {
     length += taken;
     stream.begin_ += taken + (ended ? 1 : 0);
   }
-  // A line of exactly the buffer's length takes its line end along.
-  if (!ended && length == room) ended = stream.takeLineEnd();
+  // A line of exactly the buffer's length takes its line end along, of which the `\r` may be in the buffer.
+  if (!ended && length == room) ended = stream.takeLineEnd() == 1;
   // A line that a read error cuts off is no line.
   if (!any || stream.error_ != 0) return false;
   if (ended && length > 0 && buffer[length - 1] == '\r') --length;

@@ -35,6 +35,11 @@ const char* shown(const Command& command, const char* word) {
   return findSwitch(command, "-key") == nullptr ? word : "(not shown)";
 }
 
+/// The same for a switch: only one such as `-key=...` may hold the key.
+const char* shownSwitch(const Command& command, const char* name) {
+  return UT_STR::INCompare(name, "-key", 4) == 0 ? shown(command, name) : name;
+}
+
 std::string switchNames(const Command& command) {
   std::string names;
   for (const auto& switches : {command.common, command.own})
@@ -81,7 +86,7 @@ void check(const Command& command, const UT_CMDARGS& given, const char* firstWor
     const UT_CMDSWINFO& each = *given.getsw(i);
     const Switch* row = command.switches == Switches::anyName ? &freeSwitch : findSwitch(command, each.getswname());
     if (row == nullptr)
-      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", shown(command, each.getswname()), command.word,
+      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", shownSwitch(command, each.getswname()), command.word,
              switchNames(command), command.word);
     checkSwitch(command, *row, each);
   }

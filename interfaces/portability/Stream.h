@@ -43,8 +43,8 @@ class TESSEL_EXPORT Stream {
  private:
   friend class File;
   bool fill();
-  /// Passes over a line end, if one comes next.
-  bool takeLineEnd();
+  /// Passes over a line end, if one comes next; its length.
+  std::size_t takeLineEnd();
   bool close();
 
   std::string path_;

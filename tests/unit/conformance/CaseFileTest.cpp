@@ -241,7 +241,6 @@ constexpr BadCase badExpectations[] = {
     {"case \"c\"\nexpect\nflag nothing true\n", "test.case:3: unknown flag 'nothing'"},
     {"case \"c\"\nexpect\nflag modeSet 1\n", "test.case:3: expected true or false instead of '1'"},
     {"case \"c\"\nexpect\nflag repeatCount true\n", "test.case:3: expected a number"},
-    {"case \"c\"\nexpect\ntranscript *\n", "test.case:3: expected '\"' at '*'"},
     {"case \"c\"\nexpect\n| x\n", "test.case:3: a '|' line must follow 'text'"},
     {"case \"c\"\nexpect\ntext f\nabsent g\n| x\n", "test.case:5: a '|' line must follow 'text'"},
     {"case \"c\"\nexpect\ntext f\n|\\\n", "test.case:4: '|\\' must follow a '|' line"},

@@ -21,6 +21,14 @@ TEST(Verdict, EqualTracesPass) {
   EXPECT_EQ("", verdict.details);
 }
 
+TEST(Verdict, AStarInACheckMatchesAnyValueOfThatCheck) {
+  const std::string checks = "transcript *\nenvironment A *\nflag repeatCount *\n";
+  EXPECT_TRUE(
+      judge(expecting(checks), outcome("", {"transcript \"x\"", "environment A null", "flag repeatCount 3"})).passed);
+  EXPECT_FALSE(
+      judge(expecting(checks), outcome("", {"transcript \"x\"", "environment B null", "flag repeatCount 3"})).passed);
+}
+
 TEST(Verdict, ADifferenceIsShownSideBySide) {
   const Verdict verdict = judge(expecting("status *\ncall lockCable(5) -> true\nresult true\n"),
                                 outcome("status \"a\"\ncall lockCable(4) -> true\nresult true\n"));

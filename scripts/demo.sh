@@ -1,0 +1,27 @@
+#!/usr/bin/env bash
+# Builds tessel as users get it and runs examples/quickstart.cmd in a scratch directory. Shows the lines, what
+# they print and what the session leaves behind; fails when the session fails.
+source "$(dirname "${BASH_SOURCE[0]}")/common.sh"
+
+install_missing "${build_packages[@]}"
+build_preset release tessel
+
+scratch=$(mktemp -d)
+trap 'rm -rf "$scratch"' EXIT
+cp "$root/examples/quickstart.cmd" "$scratch"
+cd "$scratch"
+# A lock of its own: whoever holds the user's cable does not stop the demo.
+export XDG_RUNTIME_DIR=$scratch
+
+show() {
+  say "$1"
+  sed 's/^/  /' "$2"
+}
+
+show "The command file quickstart.cmd" quickstart.cmd
+say "tessel quickstart.cmd"
+status=0
+"$root/build/release/bin/tessel" quickstart.cmd </dev/null || status=$?
+show "The steps it recorded, in _tesselbatch.cmd" _tesselbatch.cmd
+say "Exit code $status"
+exit "$status"
