@@ -8,6 +8,8 @@ namespace Descriptor {
 
 /// A file descriptor, or -1. A directory counts as a failure.
 int openForReading(const char* path);
+/// Whether a file can be opened for reading; never waits, also not for the writer of a pipe.
+bool isReadable(const char* path);
 /// Empties the file or makes it. `append` keeps what is there and writes behind it.
 int openForWriting(const char* path, bool append = false);
 /// The number of bytes read: 0 at the end of the file, -1 on failure.

@@ -1,6 +1,6 @@
 #include "interfaces/portability/File.h"
 
-#include <cstdio>
+#include <cerrno>
 #include <cstring>
 #include <filesystem>
 #include <system_error>
@@ -47,12 +47,7 @@ bool File::close(std::unique_ptr<Stream>& stream) {
   return ok;
 }
 
-bool File::probe(const char* path) {
-  std::FILE* file = std::fopen(path, "r");
-  if (file == nullptr) return false;
-  std::fclose(file);
-  return true;
-}
+bool File::probe(const char* path) { return Descriptor::isReadable(path); }
 
 bool File::remove(const char* path) {
   std::error_code error;

@@ -30,8 +30,9 @@ struct Switch {
 /// Which switches a command takes.
 enum class Switches {
   listed,
-  anyName,  ///< the name itself is the argument; at most one word may follow it
-  anything  ///< all words are the command's own affair
+  anyName,          ///< the name itself is the argument
+  anyNameWithWord,  ///< so, and one word may follow it
+  anything          ///< all words are the command's own affair
 };
 
 struct Command {

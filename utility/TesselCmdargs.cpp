@@ -75,19 +75,26 @@ void checkSwitch(const Command& command, const Switch& row, const UT_CMDSWINFO& 
              shown(command, given.getargtxt(i)), command.word);
 }
 
+/// The row of a switch as typed; null when the command has none of that name.
+const Switch* rowOf(const Command& command, const char* name) {
+  static constexpr Switch anyName = flag("", "");
+  static constexpr Switch anyNameWithWord = optionalText("", "", "");
+  if (command.switches == Switches::anyName) return &anyName;
+  if (command.switches == Switches::anyNameWithWord) return &anyNameWithWord;
+  return findSwitch(command, name);
+}
+
 void check(const Command& command, const UT_CMDARGS& given, const char* firstWord) {
-  // A command whose switch names are free takes one word after each of them.
-  static constexpr Switch freeSwitch = optionalText("", "", "");
   if (command.switches == Switches::anything) return;
   if (given.getnumargs() > 0)
     reject("Unexpected word %s after %s: a switch begins with -. Try help -m %s.", shown(command, firstWord),
            command.word, command.word);
   for (int i = 0; i < given.getnumsw(); ++i) {
     const UT_CMDSWINFO& each = *given.getsw(i);
-    const Switch* row = command.switches == Switches::anyName ? &freeSwitch : findSwitch(command, each.getswname());
+    const Switch* row = rowOf(command, each.getswname());
     if (row == nullptr)
-      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", shownSwitch(command, each.getswname()), command.word,
-             switchNames(command), command.word);
+      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", shownSwitch(command, each.getswname()),
+             command.word, switchNames(command), command.word);
     checkSwitch(command, *row, each);
   }
 }

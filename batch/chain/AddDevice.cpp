@@ -48,8 +48,7 @@ bool addWithCores(const Request& request) {
   if (UT_STR::ICompare(UT_PATH::GetExt(request.path), "bsd") != 0)
     return failure("Please specify the location of the IBM asic bsdl file using  -file <bsdlFile> \n");
   if (!probeFile(request.path)) return false;
-  DeviceManagerInterface::CoreFiles cores;
-  gatherCoreFiles(request.args, cores);
+  const DeviceManagerInterface::CoreFiles cores = gatherCoreFiles(request.args);
   DeviceManagerInterface& manager = *request.session.deviceManager;
   if (!manager.addDeviceByFile(request.position, request.path, nullptr, {})) return false;
   // Deliberate: the device is there, whatever becomes of its core files.

@@ -44,13 +44,14 @@ bool CmdParser::assignFileToAttachedFlash(UT_CMDARGS& args) {
 
 bool CmdParser::deleteAttachedFlash(UT_CMDARGS& args) {
   if (!checkModeSet()) return false;
+  const tESSELNS::MODE_TYPE mode = deviceManager->getActiveMode();
+  const int count = deviceManager->getDeviceChainCount();
   const UT_CMDSWINFO* positions = findSwitch(args, "-p", "-position");
   if (positions == nullptr) return failure("Position is required\n");
-  if (!isActiveMode(tESSELNS::BOUNDARY_SCAN))
+  if (mode != tESSELNS::BOUNDARY_SCAN)
     return failure("Command deleteAttachedFlash is only valid in the Boundary Scan mode.\n");
-  return removeEach(*positions, deviceManager->getDeviceChainCount(), "Device position %d not in chain, can't delete\n",
-                    [this](int position) {
-                      return deviceManager->deleteAttachedDevice(position) ||
-                             failure("Attached Flash device at position %d could not be deleted.\n", position + 1);
-                    });
+  return removeEach(*positions, count, "Device position %d not in chain, can't delete\n", [this](int position) {
+    return deviceManager->deleteAttachedDevice(position) ||
+           failure("Attached Flash device at position %d could not be deleted.\n", position + 1);
+  });
 }

@@ -8,17 +8,20 @@
 
 using Messages::failure;
 
-bool gatherCoreFiles(const UT_CMDARGS& args, DeviceManagerInterface::CoreFiles& files) {
+DeviceManagerInterface::CoreFiles gatherCoreFiles(const UT_CMDARGS& args) {
+  DeviceManagerInterface::CoreFiles files;
   for (int i = 0; const UT_CMDSWINFO* core = args.getsw("-core", i); ++i) {
     if (core->getnumargs() == 0) continue;
     const char* file = core->getargtxt(1);
     const char* extension = UT_PATH::GetExt(file);
-    if (extension == nullptr) return false;
-    if (!UT_STR::IMatch(extension, "bit") && !UT_STR::IMatch(extension, "rbt"))
-      return failure("Only .bit and .rbt files can be assigned to cores.\n");
+    if (extension == nullptr) break;
+    if (!UT_STR::IMatch(extension, "bit") && !UT_STR::IMatch(extension, "rbt")) {
+      Messages::error("Only .bit and .rbt files can be assigned to cores.\n");
+      break;
+    }
     files[core->getargnum(0)] = StringBase(file);
   }
-  return true;
+  return files;
 }
 
 std::vector<StringBase> gatherSoftwareFiles(const UT_CMDARGS& args) {
@@ -43,11 +46,8 @@ bool CmdParser::addAdditionalConfigFile(UT_CMDARGS& args) {
   if (!checkModeSet()) return false;
   const UT_CMDSWINFO* position = findSwitch(args, "-position", "-p");
   if (position == nullptr) return failure("Position is required.\n");
-  if (args.findsw("-core")) {
-    DeviceManagerInterface::CoreFiles files;
-    gatherCoreFiles(args, files);  // what was gathered before a bad file is added all the same
-    return deviceManager->addCoreFiles(position->getargnum(0), files);
-  }
+  // What was gathered before a bad core file is added all the same.
+  if (args.findsw("-core")) return deviceManager->addCoreFiles(position->getargnum(0), gatherCoreFiles(args));
   if (findSwitch(args, "-elf", "-file") != nullptr)
     return deviceManager->addExtraFiles(position->getargnum(0), gatherSoftwareFiles(args));
   return failure("-elf or -core  is required for addAdditionalConfigFiles.\n");

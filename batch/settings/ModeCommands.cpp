@@ -3,6 +3,7 @@
 #include "batch/CmdParser.h"
 #include "batch/Messages.h"
 #include "batch/Switches.h"
+#include "interfaces/constraints/ConstraintsManager.h"
 #include "interfaces/constraints/ModeKeywords.h"
 #include "interfaces/devicemanager/DeviceManagerInterface.h"
 #include "interfaces/portability/UT_STR.h"
@@ -13,11 +14,11 @@ bool CmdParser::setMode(UT_CMDARGS& args) {
   const UT_CMDSWINFO* first = args.getsw(0);
   if (first == nullptr) return failure("Mode string is required\n");
   const char* keyword = first->getswname() + 1;
+  const tESSELNS::MODE_TYPE mode = ConstraintsManager::modeString2Type(keyword);
+  const bool result = mode != tESSELNS::NO_MODE && deviceManager->setMode(mode, true);
   // Deliberate: an unknown or refused mode counts as set, too.
   modeSet = true;
-  for (const ModeKeywords::Mode& row : ModeKeywords::modes)
-    if (UT_STR::ICompare(keyword, row.keyword) == 0) return deviceManager->setMode(row.mode, true);
-  return failure("Unknown mode %d.\n", keyword);
+  return mode == tESSELNS::NO_MODE ? failure("Unknown mode %d.\n", keyword) : result;
 }
 
 bool CmdParser::setsubMode(UT_CMDARGS& args) {

@@ -76,9 +76,9 @@ PortWord classifyPort(const std::string& word) {
         port.index = at(word, row.place) == 'a' ? 0 : 1;
         break;
       case Index::usbDigit: {
-        const bool short_ = word.size() == 4;
-        if (short_) port.type = "usb";
-        port.index = at(word, short_ ? row.place - 1 : row.place) - row.zero;
+        const bool fourCharacters = word.size() == 4;
+        if (fourCharacters) port.type = "usb";
+        port.index = at(word, fourCharacters ? row.place - 1 : row.place) - row.zero;
         break;
       }
     }

@@ -22,7 +22,7 @@ class TESSEL_EXPORT File {
   /// was written did not reach the file.
   static bool close(std::unique_ptr<Stream>& stream);
 
-  /// True when the file can be opened for reading with the C runtime.
+  /// True when the file can be opened for reading. A directory can't; a pipe is not waited for.
   static bool probe(const char* path);
 
   static bool remove(const char* path);

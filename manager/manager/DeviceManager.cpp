@@ -105,7 +105,7 @@ bool DeviceManager::setMbBpiType(const char* type) {
 }
 
 bool DeviceManager::setMbBpiChain(const char* chain) {
-  return store(multiboot_.chain, chain, Port::format("SetMbBpiChain -%s", chain));
+  return store(multiboot_.chain, chain, "SetMbBpiChain " + quoted((std::string("-") + chain).c_str()));
 }
 
 bool DeviceManager::setBpiWidth(MODE_TYPE /*mode*/, const char* width) {

@@ -23,15 +23,24 @@ void note(int& error) {
   if (error == 0) error = errno;
 }
 
-}  // namespace
-
-int Descriptor::openForReading(const char* path) {
-  const int descriptor = retried([path] { return ::open(path, O_RDONLY | O_CLOEXEC); });
+/// A directory counts as a failure.
+int openFile(const char* path, int flags) {
+  const int descriptor = retried([path, flags] { return ::open(path, O_RDONLY | O_CLOEXEC | flags); });
   struct stat status {};
   if (descriptor < 0 || ::fstat(descriptor, &status) != 0 || !S_ISDIR(status.st_mode)) return descriptor;
   ::close(descriptor);
   errno = EISDIR;
   return -1;
+}
+
+}  // namespace
+
+int Descriptor::openForReading(const char* path) { return openFile(path, 0); }
+
+bool Descriptor::isReadable(const char* path) {
+  const int descriptor = openFile(path, O_NONBLOCK);
+  if (descriptor >= 0) ::close(descriptor);
+  return descriptor >= 0;
 }
 
 int Descriptor::openForWriting(const char* path, bool append) {

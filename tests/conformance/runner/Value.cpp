@@ -54,6 +54,9 @@ std::string escape(char character) {
 
 bool matches(const Value& pattern, const Value& value) {
   if (pattern.kind == Value::Kind::any) return true;
+  // An attribute may also be given by its number alone.
+  if (pattern.kind == Value::Kind::number && value.kind == Value::Kind::attribute)
+    return pattern.number == value.number;
   return pattern.kind == value.kind && pattern.number == value.number && pattern.text == value.text &&
          matches(pattern.items, value.items);
 }
