@@ -1,9 +1,14 @@
 #!/usr/bin/env bash
-# Builds tessel as users get it and measures it; benchmarks/ tells what. A number as argument is how many lines
-# the workloads have.
+# Builds the release preset and measures whole runs of tessel: lines a second, memory, start-up. With --peers it
+# first installs two JTAG shells from Debian, whose cheapest command is then measured in the same run.
+#   scripts/benchmark.sh [--peers] [LINES]
 source "$(dirname "${BASH_SOURCE[0]}")/common.sh"
 
-install_missing "${build_packages[@]}"
+peers=()
+if [[ ${1:-} == --peers ]]; then
+  peers=(urjtag openocd)
+  shift
+fi
+install_missing "${build_packages[@]}" "${peers[@]}"
 build_preset release tessel-benchmark
-say "Measuring"
 "$root/build/release/bin/tessel-benchmark" "$@"

@@ -4,13 +4,13 @@
 #include <array>
 #include <charconv>
 #include <cstdint>
-#include <cstdio>
 #include <cstring>
 #include <functional>
 #include <limits>
 #include <string_view>
 #include <utility>
 
+#include "interfaces/portability/Console.h"
 #include "interfaces/portability/Port_MsgManData.h"
 #include "interfaces/portability/UT_CMDARGS.h"
 #include "interfaces/portability/UT_STR.h"
@@ -230,6 +230,5 @@ void CommandSet::printCommands(bool echo) const {
   std::string line;
   for (int i = 0; i < getNumberCommands(); ++i) line += (i == 0 ? "" : " ") + std::string(getCommand(i));
   line += '\n';
-  std::fwrite(line.data(), 1, line.size(), stdout);
-  std::fflush(stdout);
+  Port::Console::print(line.c_str());
 }

@@ -1,7 +1,7 @@
 #include "interfaces/utility/TesselPreference.h"
 
-#include <cstdio>
-
+#include "interfaces/portability/Console.h"
+#include "interfaces/portability/FormatArgument.h"
 #include "interfaces/portability/UT_STR.h"
 
 namespace {
@@ -73,6 +73,6 @@ int TesselPreference::getNumber(PREFERENCE preference) const { return UT_STR::AT
 void TesselPreference::dump() const {
   for (int i = 0; i < count; ++i) {
     const StringBase& value = values_[static_cast<std::size_t>(i)];
-    if (!value.empty()) std::printf("Preference %s is %s\n", rows[i].name, value.c_str());
+    if (!value.empty()) Port::Console::print(Port::format("Preference %s is %s\n", rows[i].name, value).c_str());
   }
 }
