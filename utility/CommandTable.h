@@ -44,6 +44,7 @@ struct Command {
   const char* example;  ///< one line that parses
   Switches switches = Switches::listed;
   const char* note = "";  ///< what else help tells
+  bool secret = false;    ///< a word out of place may be a key: messages do not show it
 };
 
 // A switch of each shape. `argument` and `meaning` are for help.

@@ -30,15 +30,26 @@ const Switch* findSwitch(const Command& command, const char* name) {
   return found != nullptr ? found : findSwitch(command.own, name);
 }
 
-/// A word as it may stand in a message: one of a command that takes a key may be the key, mistyped.
-const char* shown(const Command& command, const char* word) {
-  return findSwitch(command, "-key") == nullptr ? word : "(not shown)";
+/// Whether a word of the line may be a key, in its place or out of it.
+bool holdsKey(const Command& command, const UT_CMDARGS& given) {
+  if (command.secret) return true;
+  for (int i = 0; i < given.getnumsw(); ++i)
+    if (UT_STR::INCompare(given.getsw(i)->getswname(), "-key", 4) == 0) return true;
+  return false;
 }
 
-/// The same for a switch: only one such as `-key=...` may hold the key.
-const char* shownSwitch(const Command& command, const char* name) {
-  return UT_STR::INCompare(name, "-key", 4) == 0 ? shown(command, name) : name;
-}
+/// A line under check.
+struct Line {
+  const Command& command;
+  const UT_CMDARGS& given;
+
+  /// A word as it may stand in a message.
+  const char* shown(const char* word) const { return holdsKey(command, given) ? "(not shown)" : word; }
+  /// The same for a switch: only one such as `-key=...` may hold the key.
+  const char* shownSwitch(const char* name) const {
+    return UT_STR::INCompare(name, "-key", 4) == 0 ? shown(name) : name;
+  }
+};
 
 std::string switchNames(const Command& command) {
   std::string names;
@@ -59,20 +70,21 @@ bool wantsNumber(const Switch& row, int index) {
   return row.kind == Kind::number || (row.kind == Kind::numberThenText && index == 0);
 }
 
-void checkSwitch(const Command& command, const Switch& row, const UT_CMDSWINFO& given) {
+void checkSwitch(const Line& line, const Switch& row, const UT_CMDSWINFO& given) {
+  const char* const command = line.command.word;
   if (given.getnumargs() < row.least)
-    reject("Switch %s of %s needs its argument: %s. Try help -m %s.", given.getswname(), command.word, row.argument,
-           command.word);
+    reject("Switch %s of %s needs its argument: %s. Try help -m %s.", given.getswname(), command, row.argument,
+           command);
   // Not the number itself: positions are 0-based by now, the user counts from 1.
   if (given.getnumargs() > row.most && row.kind == Kind::number)
-    reject("Switch %s of %s takes one number. Try help -m %s.", given.getswname(), command.word, command.word);
+    reject("Switch %s of %s takes one number. Try help -m %s.", given.getswname(), command, command);
   if (given.getnumargs() > row.most)
-    reject("Unexpected word %s after switch %s of %s. Try help -m %s.", shown(command, given.getargtxt(row.most)),
-           given.getswname(), command.word, command.word);
+    reject("Unexpected word %s after switch %s of %s. Try help -m %s.", line.shown(given.getargtxt(row.most)),
+           given.getswname(), command, command);
   for (int i = 0; i < given.getnumargs(); ++i)
     if (wantsNumber(row, i) && !isNumber(given.getargtxt(i)))
-      reject("Switch %s of %s takes a number, not %s. Try help -m %s.", given.getswname(), command.word,
-             shown(command, given.getargtxt(i)), command.word);
+      reject("Switch %s of %s takes a number, not %s. Try help -m %s.", given.getswname(), command,
+             line.shown(given.getargtxt(i)), command);
 }
 
 /// The row of a switch as typed; null when the command has none of that name.
@@ -86,16 +98,17 @@ const Switch* rowOf(const Command& command, const char* name) {
 
 void check(const Command& command, const UT_CMDARGS& given, const char* firstWord) {
   if (command.switches == Switches::anything) return;
+  const Line line{command, given};
   if (given.getnumargs() > 0)
-    reject("Unexpected word %s after %s: a switch begins with -. Try help -m %s.", shown(command, firstWord),
-           command.word, command.word);
+    reject("Unexpected word %s after %s: a switch begins with -. Try help -m %s.", line.shown(firstWord), command.word,
+           command.word);
   for (int i = 0; i < given.getnumsw(); ++i) {
     const UT_CMDSWINFO& each = *given.getsw(i);
     const Switch* row = rowOf(command, each.getswname());
     if (row == nullptr)
-      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", shownSwitch(command, each.getswname()),
+      reject("Unknown switch %s of %s, which takes %s. Try help -m %s.", line.shownSwitch(each.getswname()),
              command.word, switchNames(command), command.word);
-    checkSwitch(command, *row, each);
+    checkSwitch(line, *row, each);
   }
 }
 

@@ -103,10 +103,11 @@ constexpr Command rows[] = {
          "programSecurityRegister -p 1 -data 0F"),
     with("programUsercode", "Writes the user code.", usercodeSwitches, "programUsercode -p 1 -usercode 0000CAFE"),
     with("programCustomercode", "Writes the customer code.", dataSwitches, "programCustomercode -p 1 -data 0F"),
-    with("programEFuse", "Blows the eFuse key and control bits. This cannot be undone.", efuseSwitches,
-         "programEFuse -p 1 -control 0F",
-         "The key goes to the device and into no message, log or file of the tool; only the transcript of saveCmd\n"
-         "holds the line as it was typed.\n"),
+    {"programEFuse", 0, "Blows the eFuse key and control bits. This cannot be undone.", commonSwitches, efuseSwitches,
+     "programEFuse -p 1 -control 0F", Switches::listed,
+     "The key goes to the device and into no message, log or file of the tool; only the transcript of saveCmd\n"
+     "holds the line as it was typed.\n",
+     true},
     plain("readidcode", "Reads the IDCODE.", "readidcode -p 1"),
     plain("readusercode", "Reads the user code.", "readusercode -p 1"),
     plain("readdna", "Reads the device DNA.", "readdna -p 1"),
