@@ -17,6 +17,7 @@ if(NOT CMAKE_BUILD_TYPE)
 endif()
 
 set(TESSEL_SANITIZE "" CACHE STRING "Sanitizers to build with, such as address,undefined or thread")
+option(TESSEL_FUZZ "Build the fuzzers of tests/fuzz; needs Clang" OFF)
 
 find_program(CCACHE_PROGRAM ccache)
 if(CCACHE_PROGRAM)
@@ -36,7 +37,15 @@ if(TESSEL_SANITIZE)
   add_link_options(-fsanitize=${TESSEL_SANITIZE})
 endif()
 
+# A fuzzer sees how far it got in everything that is compiled so. Its libraries are static: a shared one cannot
+# resolve the sanitizer's symbols, which stand in the program.
+set(TESSEL_LIBRARY_KIND SHARED)
+if(TESSEL_FUZZ)
+  add_compile_options(-fsanitize=fuzzer-no-link)
+  set(TESSEL_LIBRARY_KIND STATIC)
+endif()
+
 # A shared library of the house: NAME is the target and the file's base name.
 function(tessel_library NAME)
-  add_library(${NAME} SHARED ${ARGN})
+  add_library(${NAME} ${TESSEL_LIBRARY_KIND} ${ARGN})
 endfunction()

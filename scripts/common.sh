@@ -16,13 +16,7 @@ fail() {
 }
 
 as_root() {
-  if [[ $(id -u) -eq 0 ]]; then
-    "$@"
-  elif command -v sudo >/dev/null; then
-    sudo "$@"
-  else
-    fail "This needs root and there is no sudo. Run as root: $*"
-  fi
+  if [[ $(id -u) -eq 0 ]]; then "$@"; else sudo "$@"; fi
 }
 
 is_installed() {
@@ -41,6 +35,8 @@ install_missing() {
     is_installed "$package" || missing+=("$package")
   done
   [[ ${#missing[@]} -gt 0 ]] || return 0
+  [[ $(id -u) -eq 0 ]] || command -v sudo >/dev/null ||
+    fail "There is no sudo. Run as root: apt-get install ${missing[*]}"
   say "Installing ${missing[*]}"
   local get=(env DEBIAN_FRONTEND=noninteractive apt-get -qq -o Acquire::Retries=3 -o DPkg::Lock::Timeout=120
     -o Dpkg::Use-Pty=0)
