@@ -20,7 +20,7 @@ our @kinds = (
   ['handler', \&exchanged_handlers],
 );
 
-# All edits of a source: [KIND, EDIT] each, none twice. `rand` decides what a letter becomes and which one does.
+# All edits of a source: [KIND, EDIT] each, none twice. `rand` chooses the letters that change.
 sub edits_of {
   my ($source) = @_;
   my (@found, %seen);

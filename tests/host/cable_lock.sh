@@ -38,9 +38,12 @@ exec 9>&-
 wait "$holder"
 
 hold_cable
-kill -KILL "$holder"
+# The shell would tell of the killed process.
+{
+  kill -KILL "$holder"
+  wait "$holder" || true
+} 2>/dev/null
 exec 9>&-
-{ wait "$holder" || true; } 2>/dev/null
 check 'a session that is killed leaves its lock' test -e "$lock"
 session "${take[@]}" 'quit'
 check 'which stops the next one with a hint' only_error \

@@ -313,6 +313,7 @@ TEST_F(TesselBatchMsgManTest, AMessageMayComeWhileTheLogIsPutInPlaceOrRemoved) {
   });
   for (int i = 0; i < 50; ++i) {
     TesselBatchMsgMan::installBatchLog("default");
+    TesselBatchMsgMan::installBatchLog("default");
     TesselBatchMsgMan::removeBatchLog();
   }
   done = true;

@@ -4,6 +4,7 @@
 #include "interfaces/portability/Port_MsgManDefault.h"
 #include "interfaces/portability/UT_STR.h"
 #include "tests/unit/support/ConsoleCapture.h"
+#include "tests/unit/support/Files.h"
 
 namespace {
 
@@ -127,6 +128,23 @@ TEST(Port_MsgManDefault, OutputWritesALineAsItStands) {
   manager.flush();
   EXPECT_EQ(console.errors(), "caf\xC3\xA9");
   EXPECT_EQ(console.output(), "100% %d\n");
+}
+
+TEST(Port_MsgManDefault, InOneFileWhatCameFirstStandsFirst) {
+  const testsupport::TemporaryDirectory directory;
+  std::FILE* output = std::fopen(directory.file("both").c_str(), "a");
+  std::FILE* errors = std::fopen(directory.file("both").c_str(), "a");
+  std::setbuf(errors, nullptr);
+  Port_MsgManDefault::setConsole(output, errors);
+  Port_MsgManDefault manager(nullptr);
+  manager.output(MsgType::status, L"one\n");
+  manager.output(MsgType::error, L"two\n");
+  manager.output(MsgType::status, L"three\n");
+  manager.output(MsgType::warning, L"four\n");
+  Port_MsgManDefault::setConsole(stdout, stderr);
+  std::fclose(output);
+  std::fclose(errors);
+  EXPECT_EQ(testsupport::readFile(directory.file("both")), "one\ntwo\nthree\nfour\n");
 }
 
 TEST(Port_MsgManDefault, MsgWriteEndsEveryLineOfAWrappedText) {

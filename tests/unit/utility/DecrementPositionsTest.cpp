@@ -40,7 +40,8 @@ constexpr Row rows[] = {
     {"erase -p +1 -1 -0 +0 0", "erase -p 0 -2 -1 -1 -1"},
     {"erase -p 007 00", "erase -p 6 -1"},
     {"erase -p 1x x1 1.0 0x1 1e3 1,2", "erase -p 1x x1 1.0 0x1 1e3 1,2"},
-    {"erase -p + - ++1 -+1 +-1", "erase -p + - ++1 -+1 +-1"},
+    {"erase -p + - ++1 +-1 +-", "erase -p + - ++1 +-1 +-"},
+    {"erase -p 1 -+1 1", "erase -p 0 -+1 1"},  // a switch
     {"erase -p - 4", "erase -p - 3"},
     {"erase -p \"\" \" 1\" \"1 \" \"4\"", "erase -p   1 1  3"},
     {"erase -p x 5", "erase -p x 4"},
