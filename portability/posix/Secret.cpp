@@ -3,9 +3,7 @@
 #include <string.h>
 #include <sys/resource.h>
 
-void Port::Secret::wipe(void* memory, std::size_t size) {
-  ::explicit_bzero(memory, size);
-}
+void Port::Secret::wipe(void* memory, std::size_t size) { ::explicit_bzero(memory, size); }
 
 void Port::Secret::forbidCoreDump() {
   const rlimit none{0, 0};

@@ -12,7 +12,7 @@ cd "$scratch"
 export XDG_RUNTIME_DIR=$scratch
 export LC_ALL=C
 # What a sanitizer finds must not look like a failed session.
-export ASAN_OPTIONS=exitcode=99 UBSAN_OPTIONS=exitcode=99:print_stacktrace=1 TSAN_OPTIONS=exitcode=99
+export ASAN_OPTIONS=exitcode=99 UBSAN_OPTIONS=exitcode=99:print_stacktrace=1 TSAN_OPTIONS=exitcode=99:atexit_sleep_ms=0
 
 checks=0
 failures=0

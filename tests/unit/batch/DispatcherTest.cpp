@@ -1,5 +1,6 @@
 #include "interfaces/utility/TesselCmdargs.h"
 #include "tests/unit/batch/BatchTest.h"
+#include "tests/unit/support/ChildProcess.h"
 
 namespace {
 
@@ -42,19 +43,25 @@ TEST_F(DispatcherTest, LetterCaseDoesNotCount) {
 }
 
 TEST_F(DispatcherTest, WordsOfTheHostAreUnknownOperations) {
-  for (const char* word : {"gTestWord", "kTestWord", "zTestWord", "_testWord", "9TestWord"}) {
-    TesselCmdargs::accept(word);
-    EXPECT_FALSE(dispatch(word));
-    EXPECT_THAT(messages_.take(), ElementsAre(error(std::string("Unknown operation ") + word + "\n")));
-  }
+  const auto dispatchAll = [this] {
+    for (const char* word : {"gTestWord", "kTestWord", "zTestWord", "_testWord", "9TestWord"}) {
+      TesselCmdargs::accept(word);
+      EXPECT_FALSE(dispatch(word));
+      EXPECT_THAT(messages_.take(), ElementsAre(error(std::string("Unknown operation ") + word + "\n")));
+    }
+  };
+  EXPECT_EQ(testsupport::runInChild(dispatchAll), "exit 0");  // the words stay with the process
 }
 
 TEST_F(DispatcherTest, AnUnknownWordThatBeginsWithFIsSilent) {
-  for (const char* word : {"fTestWord", "FTestWord2"}) {
-    TesselCmdargs::accept(word);
-    EXPECT_FALSE(dispatch(word));
-  }
-  EXPECT_THAT(messages_.all(), IsEmpty());
+  const auto dispatchAll = [this] {
+    for (const char* word : {"fTestWord", "FTestWord2"}) {
+      TesselCmdargs::accept(word);
+      EXPECT_FALSE(dispatch(word));
+    }
+    EXPECT_THAT(messages_.all(), IsEmpty());
+  };
+  EXPECT_EQ(testsupport::runInChild(dispatchAll), "exit 0");
 }
 
 TEST_F(DispatcherTest, AWordThatTheTableDoesNotHoldIsInvalid) {
@@ -91,10 +98,16 @@ TEST_F(DispatcherTest, WithoutADeviceManagerCommandsThatNeedNoneWork) {
                            "unsetEnv -env TESSEL_TEST_VARIABLE", "saveCmd -file x.cmd", "setLog", "ex"})
     EXPECT_TRUE(dispatch(line)) << line;
   EXPECT_TRUE(session_.quitRequested);
-  messages_.take();
-  TesselCmdargs::accept("fWithoutManager");
-  EXPECT_FALSE(dispatch("fWithoutManager"));
-  EXPECT_THAT(messages_.all(), IsEmpty());
+}
+
+TEST_F(DispatcherTest, WithoutADeviceManagerAnUnknownWordThatBeginsWithFIsSilent) {
+  session_.deviceManager = nullptr;
+  const auto dispatchWord = [this] {
+    TesselCmdargs::accept("fWithoutManager");
+    EXPECT_FALSE(dispatch("fWithoutManager"));
+    EXPECT_THAT(messages_.all(), IsEmpty());
+  };
+  EXPECT_EQ(testsupport::runInChild(dispatchWord), "exit 0");
 }
 
 TEST_F(DispatcherTest, InfoIsNotedWhileItRuns) {

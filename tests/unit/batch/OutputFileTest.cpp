@@ -57,9 +57,8 @@ TEST_F(OutputFileTest, AQuietAttributeSuspendsRecordingForTheCallEvenWhenItFails
   for (const bool quiet : {true, false}) {
     // The refusal is issued inside the call: a step taken there shows whether recording is on.
     const int speed = quiet ? 1 : 2;
-    Port_MsgDispatcher::setObserver([this, speed](MsgType, const std::string&) {
-      session_.deviceManager->setCableSpeed(speed);
-    });
+    Port_MsgDispatcher::setObserver(
+        [this, speed](MsgType, const std::string&) { session_.deviceManager->setCableSpeed(speed); });
     EXPECT_FALSE(session_.setConfigDeviceAttribute(ConfigDeviceNS::FILE_NAME, "x", quiet));
     Port_MsgDispatcher::setObserver({});
     session_.deviceManager->setCableSpeed(speed + 10);

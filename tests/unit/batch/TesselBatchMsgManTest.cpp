@@ -227,11 +227,7 @@ TEST_F(TesselBatchMsgManTest, RemovalOfNothingDoesNothing) {
 }
 
 TEST_F(TesselBatchMsgManTest, ALogThatWasNeverInstalledEndsQuietly) {
-  testsupport::ChildProcess child([] {  // in a process of its own, for a mistake here ends it
-    { const TesselBatchMsgMan log("bench.log"); }
-    return 0;
-  });
-  EXPECT_EQ(child.wait(), "exit 0");
+  EXPECT_EQ(testsupport::runInChild([] { const TesselBatchMsgMan log("bench.log"); }), "exit 0");
 }
 
 TEST_F(TesselBatchMsgManTest, ALogThatCantBeWrittenStopsNoMessage) {

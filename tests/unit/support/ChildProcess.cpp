@@ -1,5 +1,6 @@
 #include "tests/unit/support/ChildProcess.h"
 
+#include <gtest/gtest.h>
 #include <poll.h>
 #include <signal.h>
 #include <sys/resource.h>
@@ -108,6 +109,15 @@ std::string ChildProcess::wait() {
   id_ = -1;
   return WIFSIGNALED(status) ? "signal " + std::to_string(WTERMSIG(status))
                              : "exit " + std::to_string(WEXITSTATUS(status));
+}
+
+std::string runInChild(const std::function<void()>& body) {
+  ChildProcess child([&body] {
+    body();
+    return testing::Test::HasFailure() ? 1 : 0;
+  });
+  const std::string printed = child.readAll();
+  return printed + child.wait();
 }
 
 }  // namespace testsupport

@@ -44,4 +44,8 @@ class ChildProcess {
   std::string pending_;
 };
 
+/// Runs a function in a copy of this process, for what can't be undone or may end it. How the copy ends, behind
+/// what it prints: "exit 0" unless a check in it fails.
+std::string runInChild(const std::function<void()>& body);
+
 }  // namespace testsupport

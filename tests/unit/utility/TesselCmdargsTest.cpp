@@ -6,6 +6,7 @@
 #include "interfaces/portability/UT_STR.h"
 #include "interfaces/utility/CommandSet.h"
 #include "interfaces/utility/TesselCmdargs.h"
+#include "tests/unit/support/ChildProcess.h"
 #include "tests/unit/support/RecordedMessages.h"
 
 namespace {
@@ -427,7 +428,7 @@ TEST(TesselCmdargs, UsageTextsAreWhole) {
   EXPECT_EQ(usage(""), "");
 }
 
-TEST(TesselCmdargs, AcceptAddsAWordWithoutSwitches) {
+void acceptAWord() {
   EXPECT_EQ(judged("myTestWord"), "unknown: myTestWord");
   TesselCmdargs::accept("myTestWord");
   TesselCmdargs::accept("MYTESTWORD");
@@ -435,6 +436,10 @@ TEST(TesselCmdargs, AcceptAddsAWordWithoutSwitches) {
   EXPECT_EQ(judged("myTestWord -p 1"), "Unknown switch -p of myTestWord, which takes no switches.");
   EXPECT_THAT(textsOf(TesselCmdargs::findMatchingCommands("testword")), ElementsAre("myTestWord"));
   EXPECT_EQ(TesselCmdargs::findBatchFormatString("mytestword"), StringBase("myTestWord: A word of the host.\n"));
+}
+
+TEST(TesselCmdargs, AcceptAddsAWordWithoutSwitches) {
+  EXPECT_EQ(testsupport::runInChild(acceptAWord), "exit 0");  // the word stays with the process
 }
 
 TEST(TesselCmdargs, AcceptOfAKnownWordChangesNothing) {
