@@ -81,6 +81,7 @@ bool holds(std::string_view text, std::string_view part) {
 bool keyIsSecret(const Input& input) {
   const auto isWhole = [](const std::string& line) { return line.size() < roomOfLine; };
   if (input.commands.find('"') != std::string_view::npos) return false;
+  if (input.description.find(key) != std::string::npos) return false;
   if (!std::all_of(input.lines.begin(), input.lines.end(), isWhole)) return false;
   for (std::size_t at = input.commands.find(key); at != std::string_view::npos; at = input.commands.find(key, at + 1)) {
     const std::size_t end = at + key.size();
