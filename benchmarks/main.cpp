@@ -41,21 +41,27 @@ double linesPerSecond(const Workload& workload, const Run& run) {
   return static_cast<double>(workload.lines) / run.seconds;
 }
 
-/// The run and one of ten times the lines; the rate of the longer one.
-double report(const Workload& workload, const Workload& tenfold) {
+/// The run, and one of ten times the lines.
+void report(const Workload& workload, const Workload& tenfold) {
   const Run run = fastestOf(rounds, {prepare(workload)})[0];
   const Run longRun = fastestOf(2, {prepare(tenfold)})[0];
   std::printf("%-24s %7.2f million lines/s %8.1f MiB   10x the lines: %5.1fx the time, %7.1f MiB%s\n",
               workload.name.c_str(), linesPerSecond(workload, run) / 1e6, static_cast<double>(run.memory) / 1024,
               longRun.seconds / run.seconds, static_cast<double>(longRun.memory) / 1024,
               run.ok && longRun.ok ? "" : "   FAILED");
-  return linesPerSecond(workload, run);
 }
 
-double reportPeer(const Workload& workload) {
-  const Run run = fastestOf(rounds, {prepare(workload)})[0];
-  std::printf("%-24s %7.2f million lines/s\n", workload.name.c_str(), linesPerSecond(workload, run) / 1e6);
-  return linesPerSecond(workload, run);
+/// The cheapest commands of the installed peers beside ours, all in turn so that they meet the same noise.
+void reportPeers(const Workload& ours, const std::vector<Workload>& peers) {
+  std::vector<std::vector<std::string>> programs = {prepare(ours)};
+  for (const Workload& peer : peers) programs.push_back(prepare(peer));
+  const std::vector<Run> runs = fastestOf(2 * rounds, programs);
+  const double own = linesPerSecond(ours, runs[0]);
+  for (std::size_t i = 0; i < peers.size(); ++i) {
+    const double rate = linesPerSecond(peers[i], runs[i + 1]);
+    std::printf("%-24s %7.2f million lines/s; %s beside it %.2f, %.2f times as fast\n", peers[i].name.c_str(),
+                rate / 1e6, ours.name.c_str(), own / 1e6, own / rate);
+  }
 }
 
 void reportStart() {
@@ -76,16 +82,8 @@ int main(int argc, char** argv) {
   const Scratch scratch;
   const auto workloads = tesselWorkloads(lines);
   const auto tenfold = tesselWorkloads(10 * lines);
-  double cheapestCommand = 0;
-  for (std::size_t i = 0; i < workloads.size(); ++i) {
-    const double rate = report(workloads[i], tenfold[i]);
-    if (i == 0) cheapestCommand = rate;
-  }
-  double fastestPeer = 0;
-  for (const Workload& peer : peerWorkloads(lines)) fastestPeer = std::max(fastestPeer, reportPeer(peer));
-  if (fastestPeer > 0)
-    std::printf("%s is %.2f times as fast as the fastest peer\n", workloads[0].name.c_str(),
-                cheapestCommand / fastestPeer);
+  for (std::size_t i = 0; i < workloads.size(); ++i) report(workloads[i], tenfold[i]);
+  reportPeers(workloads[0], peerWorkloads(lines));
   reportStart();
   return 0;
 }

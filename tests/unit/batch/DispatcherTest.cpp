@@ -7,7 +7,6 @@ namespace {
 using testing::ElementsAre;
 using testing::IsEmpty;
 using testing::Not;
-using testing::StartsWith;
 using testsupport::error;
 
 class DispatcherTest : public BatchTest {
