@@ -25,7 +25,7 @@ constexpr Row rows[] = {
     {"program -p 1", "program -p 0"},
     {"program -position 1", "program -position 0"},
     {"program -P 1 -POSITION 2 -pOsItIoN 3", "program -P 0 -POSITION 1 -pOsItIoN 2"},
-    {"program -port 1 -part 2 -pos 3 -positions 4 -p1 5", "program -port 1 -part 2 -pos 3 -positions 4 -p1 5"},
+    {"program -port 1 -part 2 -pos 3 -positions 4", "program -port 1 -part 2 -pos 3 -positions 4"},
     {"program 1 2", "program 1 2"},
     {"program", "program"},
     {"-p 1", "-p 1"},  // the command word is no switch
