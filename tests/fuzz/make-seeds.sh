@@ -128,8 +128,8 @@ done
 for name in Lines Table Pdr Session; do
   corpus=$fuzz/corpus/${name}Fuzzer
   mkdir -p "$corpus" "$scratch/chosen/$name"
-  # Inputs that once broke something stay whatever they reach.
-  find "$corpus" -type f ! -name 'found-*' -delete
+  # Inputs that once broke something, and those made by hand, stay whatever they reach.
+  find "$corpus" -type f ! -name 'found-*' ! -name 'kept-*' -delete
   "$bin/${name}Fuzzer" -set_cover_merge=1 -use_counters=0 "$scratch/chosen/$name" "$scratch/$name" "$corpus" \
     >/dev/null 2>merge.log || fail "$(tail -n 5 merge.log)"
   for seed in "$name"/*; do
