@@ -88,7 +88,7 @@ bool TerminalSession::running() {
 int TerminalSession::finish() {
   for (int i = 0; i < patience && running(); ++i)
     if (!collect()) ::usleep(tenthOfSecond * 1000);
-  while (collect() && running()) continue;
   if (running()) return 1000;
+  for (int i = 0; i < patience && collect(); ++i) continue;  // what it wrote last
   return WIFSIGNALED(status_) ? -WTERMSIG(status_) : WEXITSTATUS(status_);
 }
