@@ -60,6 +60,7 @@ bool Pdr::read() {
   for (int line = 1; std::getline(file, text); ++line) {
     const std::string_view content = trimmed(text);
     if (content.empty() || content.front() == '#') continue;
+    if (content.find('\0') != std::string_view::npos) return fail(path_, line, "a zero byte in the line");
     const std::size_t end = content.find_first_of(blanks);
     const std::string keyword(content.substr(0, end));
     const std::string value(end == std::string_view::npos ? "" : trimmed(content.substr(end)));

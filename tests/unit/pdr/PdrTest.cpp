@@ -125,6 +125,11 @@ TEST_F(PdrTest, LinesMayBeWrittenLoosely) {
   EXPECT_THAT(devices(0), ElementsAre("# no comment"));
 }
 
+TEST_F(PdrTest, AZeroByteInALineIsAReadError) {
+  EXPECT_FALSE(read(std::string("MODE pffserial\nPROM \0\n", 22)));
+  EXPECT_THAT(messages_.all(), ElementsAre(testsupport::error(path_ + ":2: a zero byte in the line\n")));
+}
+
 TEST_F(PdrTest, TheLastValueOfAKeywordCounts) {
   EXPECT_TRUE(read("MODE pffserial\nFILL_VALUE 00\nFILL_VALUE FF\nMODE pffbpi\n"));
   EXPECT_STREQ(pdr_.getFillValue(), "FF");
