@@ -1,30 +1,30 @@
-# A first session. It needs no hardware: port null is a cable that goes nowhere.
-# Run it with: tessel examples/quickstart.cmd
+# A first session. It needs no hardware: port null is a simulated board, with an FPGA that has an SPI flash behind
+# it, a PROM and a CPLD. It wants a bitstream beside it, which this makes:
+#   tessel-board --bitstream marlin3-4 top.bit --usercode C0FFEE01
+# Run it with: tessel quickstart.cmd
 
-// What kind of work follows, and how patient to be when another session has the cable.
 setMode -bscan
-setPreference -pref cableLockTries:3
-
-// Open the cable and take its lock, then ask what is there.
 setCable -port null
-info
 
-// Operations with -target work on this device of the chain; counting starts at 1.
-setTargetDevice -position 1
+// What is on the chain? Counting starts at 1, behind TDI.
+identify
 
-// The lines of a loop run once it ends.
-repeatStart -loop 2
-  info
-repeatEnd
+// Say what goes where: the FPGA, the PROM, and the flash memory behind the FPGA.
+assignFile -position 1 -file top.bit
+assignFile -position 2 -file top.bit
+attachFlash -position 1 -spi w25q64
+assignFileToAttachedFlash -position 1 -file top.bit
 
-// The environment of the session, and of what it starts.
-setEnv -env LAB_BENCH -value 7
+// Erase, program and verify all three.
+program -p 1 2 -e -v -showprogress
+program -p 1 -spionly -e -v -showprogress
 
-// Every command tells how to use it.
-help -m setCableSpeed
-help -c cable
+// The FPGA has started up with its new user code.
+readusercode -p 1
+
+// Read half a megabyte of the flash back into a hex file.
+readbacktofile -p 1 -spionly -size 524288 -file flash.mcs
 
 // Give the cable back. A file that does not quit goes on at the prompt.
 closeCable
-info
 quit

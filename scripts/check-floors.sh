@@ -22,6 +22,12 @@ find_wrong_includes() {
         count = split(rows[i], names, " ")
         for (j = 1; j <= count; ++j) floor[names[j]] = i
       }
+      # The same within manager/, a folder a floor.
+      within = split("support|scan|parts content|simulator chain devices|cables|operations|manager", rows, "|")
+      for (i = 1; i <= within; ++i) {
+        count = split(rows[i], names, " ")
+        for (j = 1; j <= count; ++j) inner[names[j]] = i
+      }
       # Devices are known through their interfaces only, so that they can be exchanged.
       onlyInterfaces["batch"]
     }
@@ -30,6 +36,12 @@ find_wrong_includes() {
       if (!(to in floor) || floor[to] >= floor[from]) return 0
       return !(from in onlyInterfaces) || to == "interfaces"
     }
+    # The folder behind the first one of a path.
+    function second(path) {
+      sub(/^[^\/]*\//, "", path)
+      return sub(/\/.*$/, "", path) ? path : ""
+    }
+    function allowedWithin(from, to) { return from == to || (to in inner && inner[to] < inner[from]) }
     function complain(why) { printf "%s:%d: %s\n", FILENAME, FNR, why }
     /^[ \t]*#[ \t]*include[ \t]*["<]/ {
       quoted = $0 ~ /include[ \t]*"/
@@ -42,6 +54,8 @@ find_wrong_includes() {
       sub(/\/.*$/, "", from)
       if (folder in floor) {
         if (!allowed(from, folder)) complain(from "/ may not include " path)
+        if (from == "manager" && folder == from && !allowedWithin(second(FILENAME), second(path)))
+          complain("manager/" second(FILENAME) "/ may not include " path)
       } else if (quoted) {
         complain("\"" path "\" is no path from the root of the tree")
       }

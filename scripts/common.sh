@@ -6,7 +6,9 @@ set -euo pipefail
 root=$(cd "$(dirname "${BASH_SOURCE[0]}")/.." && pwd)
 
 # What a build with tests needs. ccache is used when it is there.
-build_packages=(g++ cmake ninja-build libcli11-dev libgtest-dev libgmock-dev)
+build_packages=(g++ cmake ninja-build libcli11-dev nlohmann-json3-dev libgtest-dev libgmock-dev)
+# Programs that judge ours in the tests with the label interop, which are skipped where they are missing.
+interop_packages=(openocd srecord)
 
 say() { printf '== %s\n' "$*"; }
 

@@ -7,7 +7,7 @@ source "$(dirname "${BASH_SOURCE[0]}")/common.sh"
 preset=${1:-dev}
 [[ $# -eq 0 ]] || shift
 
-install_missing "${build_packages[@]}"
+install_missing "${build_packages[@]}" "${interop_packages[@]}"
 # The thread sanitizer's fixed memory layout and a kernel that scatters addresses widely do not go together;
 # the build counts, too, for it asks the test programs for their tests.
 if [[ $preset == tsan && -z ${TESSEL_FIXED_ADDRESSES:-} ]] && setarch --addr-no-randomize true 2>/dev/null; then

@@ -6,17 +6,23 @@
 
 namespace {
 
+enum class Kind { number, truth, path };
+
 struct Row {
   const char* name;
   const char* initial;
   const char* expected;
-  int least;  ///< of a number; -1 for a preference that is true or false
+  Kind kind;
+  int least = 0;  ///< of a number
 };
 /// In the order of the enumeration.
 constexpr Row rows[TesselPreference::count] = {
-    {"lineWidth", "0", "a number of columns, 0 for no wrapping", 0},
-    {"recordSteps", "true", "true or false", -1},
-    {"cableLockTries", "1", "a number of tries, 1 or more", 1},
+    {"lineWidth", "0", "a number of columns, 0 for no wrapping", Kind::number},
+    {"recordSteps", "true", "true or false", Kind::truth},
+    {"cableLockTries", "1", "a number of tries, 1 or more", Kind::number, 1},
+    {"parts_dir", "", "the path of a directory with BSDL files", Kind::path},
+    {"eraseFirst", "false", "true or false", Kind::truth},
+    {"verifyAfter", "false", "true or false", Kind::truth},
 };
 
 const Row* rowOf(TesselPreference::PREFERENCE preference) {
@@ -24,7 +30,8 @@ const Row* rowOf(TesselPreference::PREFERENCE preference) {
 }
 
 bool accepts(const Row& row, const char* value) {
-  if (row.least < 0) return UT_STR::ICompare(value, "true") == 0 || UT_STR::ICompare(value, "false") == 0;
+  if (row.kind == Kind::path) return true;
+  if (row.kind == Kind::truth) return UT_STR::ICompare(value, "true") == 0 || UT_STR::ICompare(value, "false") == 0;
   if (*value == '\0') return false;
   for (const char* digit = value; *digit != '\0'; ++digit)
     if (*digit < '0' || *digit > '9') return false;

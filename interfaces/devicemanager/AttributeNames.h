@@ -20,11 +20,23 @@ struct Row {
 };
 
 inline constexpr Row<DeviceNS::ATTRIBUTE> device[] = {
-    {"name", DeviceNS::NAME},          {"state", DeviceNS::STATE},
-    {"csPin", DeviceNS::CS_PIN},       {"configFileName", DeviceNS::CONFIG_FILE_NAME},
-    {"irLength", DeviceNS::IR_LENGTH}, {"key", DeviceNS::KEY},
-    {"mpmPair", DeviceNS::MPM_PAIR},   {"spiPart", DeviceNS::SPI_PART},
-    {"spiFile", DeviceNS::SPI_FILE},   {"bpiPart", DeviceNS::BPI_PART},
+    {"name", DeviceNS::NAME},
+    {"state", DeviceNS::STATE},
+    {"csPin", DeviceNS::CS_PIN},
+    {"configFileName", DeviceNS::CONFIG_FILE_NAME},
+    {"irLength", DeviceNS::IR_LENGTH},
+    {"key", DeviceNS::KEY},
+    {"mpmPair", DeviceNS::MPM_PAIR},
+    {"eraseFirst", DeviceNS::ERASE_FIRST},
+    {"verifyAfter", DeviceNS::VERIFY_AFTER},
+    {"onlyFpga", DeviceNS::ONLY_FPGA},
+    {"usercode", DeviceNS::USERCODE},
+    {"ues", DeviceNS::UES},
+    {"revision", DeviceNS::REVISION},
+    {"bpiWidth", DeviceNS::BPI_WIDTH},
+    {"spiPart", DeviceNS::SPI_PART},
+    {"spiFile", DeviceNS::SPI_FILE},
+    {"bpiPart", DeviceNS::BPI_PART},
     {"bpiFile", DeviceNS::BPI_FILE},
 };
 inline constexpr Row<ConfigDeviceNS::ATTRIBUTE> configDevice[] = {

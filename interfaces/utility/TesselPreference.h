@@ -8,8 +8,16 @@
 /// The preferences of the process: texts by name. One object, made at the first use; one thread.
 class TESSEL_EXPORT TesselPreference {
  public:
-  enum PREFERENCE : int { unknown = -1, lineWidth = 0, recordSteps = 1, cableLockTries = 2 };
-  static constexpr int count = 3;
+  enum PREFERENCE : int {
+    unknown = -1,
+    lineWidth = 0,
+    recordSteps = 1,
+    cableLockTries = 2,
+    partsDirectory = 3,
+    eraseFirst = 4,
+    verifyAfter = 5
+  };
+  static constexpr int count = 6;
 
   static TesselPreference& getPreferenceObject();
 

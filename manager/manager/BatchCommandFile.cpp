@@ -4,7 +4,7 @@
 #include <cstring>
 
 #include "interfaces/portability/File.h"
-#include "manager/manager/Report.h"
+#include "manager/support/Report.h"
 
 void BatchCommandFile::rename(const std::string& path) {
   if (path == path_) return;

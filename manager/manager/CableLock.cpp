@@ -1,10 +1,13 @@
 #include "manager/manager/CableLock.h"
 
+#include <cctype>
 #include <chrono>
+#include <functional>
 #include <thread>
 
+#include "interfaces/portability/FormatArgument.h"
 #include "interfaces/portability/OwnedFile.h"
-#include "manager/manager/Report.h"
+#include "manager/support/Report.h"
 
 namespace {
 
@@ -17,13 +20,43 @@ bool refuse(const std::string& path, const Port::OwnedFile::Owner& owner) {
                      path, owner.process);
 }
 
+/// A name that may stand in a file name; what is long or odd is told apart by its hash.
+std::string fileName(const std::string& name) {
+  constexpr std::size_t longest = 60;
+  std::string result;
+  for (const char each : name) {
+    const bool plain = std::isalnum(static_cast<unsigned char>(each)) != 0 || each == '.' || each == '-';
+    result += plain ? each : '_';
+  }
+  if (result.size() > longest) result.erase(0, result.size() - longest);
+  return result + Port::format("-%08x", static_cast<std::uint32_t>(std::hash<std::string>()(name)));
+}
+
 }  // namespace
 
 CableLock::CableLock() : CableLock(Port::OwnedFile::runtimeDirectory() + "/cable.lock") {}
 
-CableLock::CableLock(std::string path) : path_(std::move(path)) {}
+CableLock::CableLock(std::string path) : path_(path), commonPath_(std::move(path)) {}
 
 CableLock::~CableLock() { unlock(); }
+
+void CableLock::use(const std::string& cable) {
+  std::string path = commonPath_;
+  if (!cable.empty()) {
+    const std::string ending = ".lock";
+    path.resize(path.size() - ending.size());
+    path += "-" + fileName(cable) + ending;
+  }
+  if (path == path_) return;
+  unlock();
+  path_ = path;
+}
+
+bool CableLock::tryLock() {
+  Port::OwnedFile::Owner owner;
+  held_ = held_ || Port::OwnedFile::create(path_, owner);
+  return held_;
+}
 
 bool CableLock::lock(int tries) {
   if (held_) return true;

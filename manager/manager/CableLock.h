@@ -14,6 +14,12 @@ class CableLock {
   CableLock(const CableLock&) = delete;
   CableLock& operator=(const CableLock&) = delete;
 
+  /// From now on the lock is the one of that cable: a file of its own beside the common one, which the empty name
+  /// means. A lock of another name that is held is given back.
+  void use(const std::string& cable);
+
+  /// Takes the lock when nobody has it; false, without a message, when somebody does.
+  bool tryLock();
   /// Takes the lock, trying up to `tries` times, a tenth of a second apart. True when it is held already;
   /// false after an error that names the owner.
   bool lock(int tries);
@@ -28,5 +34,6 @@ class CableLock {
 
  private:
   std::string path_;
+  std::string commonPath_;  ///< the file of the empty name
   bool held_ = false;
 };

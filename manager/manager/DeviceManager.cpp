@@ -5,7 +5,7 @@
 #include "interfaces/portability/Port_MsgDispatcher.h"
 #include "interfaces/portability/Port_MsgManDefault.h"
 #include "interfaces/portability/UT_STR.h"
-#include "manager/manager/Report.h"
+#include "manager/support/Report.h"
 
 bool DeviceManager::recording = true;
 
@@ -33,6 +33,9 @@ std::string quoted(const char* value) {
 
 }  // namespace
 
+DeviceManager::DeviceManager() = default;
+DeviceManager::~DeviceManager() { disconnect(); }
+
 bool DeviceManager::setMode(MODE_TYPE mode, bool makeActive) {
   if (mode < tESSELNS::BOUNDARY_SCAN || mode > tESSELNS::PROM_FILE_FORMATTER)
     return reportError("There is no mode %d.\n", mode);
@@ -54,8 +57,15 @@ bool DeviceManager::setSubmode(SUBMODE_TYPE submode) {
   return true;
 }
 
-bool DeviceManager::clearMode(MODE_TYPE /*mode*/) { return true; }
-bool DeviceManager::clearAllModes() { return true; }
+bool DeviceManager::clearMode(MODE_TYPE mode) {
+  chains_.erase(mode);
+  return true;
+}
+
+bool DeviceManager::clearAllModes() {
+  chains_.clear();
+  return true;
+}
 
 void DeviceManager::setTargetDevice(MODE_TYPE mode, int position, bool attached) {
   const Target target{mode, position, attached};
@@ -110,46 +120,6 @@ bool DeviceManager::setMbBpiChain(const char* chain) {
 
 bool DeviceManager::setBpiWidth(MODE_TYPE /*mode*/, const char* width) {
   return store(multiboot_.width, width, "SetBpiWidth -width " + quoted(width));
-}
-
-bool DeviceManager::setCable(const char* type, int /*port*/, int /*baud*/, bool /*open*/, const char* /*server*/,
-                             bool /*quiet*/) {
-  if (type == nullptr) return reportError("The port word names no cable. Try help -m setCable.\n");
-  if (UT_STR::ICompare(type, "null") != 0)
-    return reportError("Cable %s can't be opened: this device manager drives no hardware yet. Port null is there.\n",
-                       type);
-  return store(cable_, type, "setCable -port null");
-}
-
-bool DeviceManager::lockCable(int /*kind*/) {
-  return cableLock_.lock(TesselPreference::getPreferenceObject().getNumber(TesselPreference::cableLockTries));
-}
-
-bool DeviceManager::unlockCable() { return cableLock_.unlock(); }
-
-bool DeviceManager::closeCable(bool /*final*/) {
-  cable_.clear();
-  return true;
-}
-
-int DeviceManager::setCableSpeed(int speed) {
-  if (speed != cableSpeed_) recordStep(Port::format("setCableSpeed -speed %d", speed));
-  cableSpeed_ = speed;
-  return cableSpeed_;
-}
-
-bool DeviceManager::setCableOption(const char* name, const char* value) {
-  if (UT_STR::ICompare(name, "clean_cable_lock") != 0)
-    return reportError("Unknown cable option %s, expected clean_cable_lock.\n", name);
-  if (UT_STR::ICompare(value, "true") != 0)
-    return reportError("Cable option clean_cable_lock can't be \"%s\", expected true.\n", value);
-  return cableLock_.clean();
-}
-
-bool DeviceManager::info() {
-  reportStatus("Cable: %s%s\n", cable_.empty() ? "none" : cable_, cableLock_.held() ? ", locked" : "");
-  reportStatus("Devices on the chain: %d\n", getDeviceChainCount());
-  return true;
 }
 
 bool DeviceManager::writeBatchCommand(const StringBase& line) { return batchCommands_.write(std::string(line.view())); }

@@ -1,16 +1,25 @@
 #pragma once
 
+#include <map>
+#include <memory>
 #include <string>
+#include <vector>
 
 #include "interfaces/devicemanager/DeviceManagerInterface.h"
 #include "interfaces/utility/DeviceOptionsMgr.h"
+#include "manager/cables/CableChoice.h"
+#include "manager/chain/DeviceChain.h"
 #include "manager/manager/BatchCommandFile.h"
 #include "manager/manager/CableLock.h"
 
-/// The bundled device manager. It keeps the session's device-side state, holds the cable lock and records
-/// steps in the batch-command file. What needs devices, chains or content refuses with an error that says so.
+/// The bundled device manager. It keeps the session's device-side state and the chain of each mode, holds the cable
+/// and its lock, has operations carried out and records steps in the batch-command file. What needs content of the
+/// formatter modes, projects or archives refuses with an error that says so.
 class DeviceManager : public DeviceManagerInterface {
  public:
+  DeviceManager();
+  ~DeviceManager() override;
+
   MODE_TYPE getMode() override { return mode_; }
   MODE_TYPE getActiveMode() override { return activeMode_; }
   bool setMode(MODE_TYPE mode, bool makeActive) override;
@@ -43,7 +52,7 @@ class DeviceManager : public DeviceManagerInterface {
   const char* getAttribute(int number) override;
   DeviceOptionsMgr* getDeviceOptionsMgr(MODE_TYPE mode, int position, bool attachedFlash) override;
 
-  int getDeviceChainCount() override { return 0; }
+  int getDeviceChainCount() override;
   bool addDeviceByPart(int position, const char* part) override;
   bool addDeviceByFile(int position, const char* file, const char* bmmFile,
                        std::vector<StringBase> extraFiles) override;
@@ -113,16 +122,46 @@ class DeviceManager : public DeviceManagerInterface {
   bool store(std::string& field, const char* value, const std::string& step);
   void recordStep(const std::string& line);
 
+  bool hasChain(MODE_TYPE mode) const { return mode >= tESSELNS::BOUNDARY_SCAN && mode <= tESSELNS::SPI; }
+  /// The chain of the active mode; null, after an error, in a mode without one.
+  DeviceChain* chain(const char* command);
+  /// A device of that chain; null after an error.
+  ChainDevice* device(const char* command, int position);
+  /// Puts a device into the chain.
+  bool insert(int position, ChainDevice device, const std::string& step);
+
+  /// The parts, from the directories that are named now.
+  PartLibrary& parts();
+  /// Carries out a command of operations; its words are parsed.
+  bool runOperation(Cable& cable, const UT_CMDARGS& args);
+
+  /// The open cable, opened again after a link was lost; null after an error.
+  Cable* openCable();
+  bool connect();
+  void disconnect();
+  int multibootBpiWidth() const;
+
   MODE_TYPE mode_ = tESSELNS::NO_MODE;
   MODE_TYPE activeMode_ = tESSELNS::NO_MODE;
   SUBMODE_TYPE submode_ = tESSELNS::PFF_SERIAL;
   bool submodeSet_ = false;  ///< since the mode was chosen
   Target target_;
   Multiboot multiboot_;
-  std::string cable_;  ///< the type of the open cable; empty when none is
   int cableSpeed_ = 0;
   bool (*progress_)(Callback&) = nullptr;
   DeviceOptionsMgr noOptions_;
+  std::vector<std::string> partsDirectories_;  ///< those that `parts_` searches
+  PartLibrary parts_;
+  std::map<MODE_TYPE, DeviceChain> chains_;
+  std::string answer_;         ///< the text that was given away last
+  std::string lastOperation_;  ///< how it ended, for `getAttribute`
+  bool lastFailed_ = false;
+
   CableLock cableLock_;
+  CableOpener opener_{parts_};
+  CableChoice choice_;
+  std::string boardFile_;
+  std::uint32_t tckLimit_ = 0;  ///< Hz; 0 for none
+  std::unique_ptr<Cable> cable_;
   BatchCommandFile batchCommands_;
 };

@@ -1,56 +1,15 @@
-// What the bundled device manager can't do yet: every operation here needs devices, a chain or content, and
-// refuses with one error that names the operation.
+// What the bundled device manager can't do yet: every operation here is about the content of the formatter modes,
+// projects or archives, and refuses with one error that names the operation.
 
 #include "manager/manager/DeviceManager.h"
-#include "manager/manager/Report.h"
+#include "manager/support/Report.h"
 
 namespace {
 
-bool refuse(const char* operation) {
-  return reportError("%s needs devices, which this device manager does not drive yet.\n", operation);
-}
+bool refuse(const char* operation) { return reportError("%s is not built yet.\n", operation); }
 
 }  // namespace
 
-bool DeviceManager::runDiagnostics() { return refuse("runCableDiagnostics"); }
-bool DeviceManager::performOperation(int count, const char* const* words) {
-  return refuse(count > 0 ? words[0] : "The operation");
-}
-const char* DeviceManager::getAttribute(int /*number*/) { return ""; }
-DeviceOptionsMgr* DeviceManager::getDeviceOptionsMgr(MODE_TYPE /*mode*/, int /*position*/, bool /*attachedFlash*/) {
-  return &noOptions_;
-}
-
-bool DeviceManager::addDeviceByPart(int /*position*/, const char* /*part*/) { return refuse("addDevice"); }
-bool DeviceManager::addDeviceByFile(int /*position*/, const char* /*file*/, const char* /*bmmFile*/,
-                                    std::vector<StringBase> /*extraFiles*/) {
-  return refuse("addDevice");
-}
-bool DeviceManager::addCoreFiles(int /*position*/, CoreFiles /*files*/) { return refuse("Adding core files"); }
-bool DeviceManager::clearCoreFiles(int /*position*/, int /*core*/) { return refuse("Clearing core files"); }
-bool DeviceManager::addExtraFiles(int /*position*/, std::vector<StringBase> /*files*/) {
-  return refuse("Adding extra files");
-}
-bool DeviceManager::clearAdditionalConfigFiles(int /*position*/) { return refuse("clearAdditionalConfigFiles"); }
-bool DeviceManager::assignFile(int /*position*/, const char* /*file*/) { return refuse("assignFile"); }
-bool DeviceManager::removeDevice(int /*position*/) { return refuse("deleteDevice"); }
-bool DeviceManager::attachDeviceByPart(int /*position*/, FLASH_TYPE /*type*/, const char* /*part*/) {
-  return refuse("attachFlash");
-}
-bool DeviceManager::assignFileToFlashDevice(int /*position*/, FLASH_TYPE /*type*/, const char* /*file*/) {
-  return refuse("assignFileToAttachedFlash");
-}
-bool DeviceManager::deleteAttachedDevice(int /*position*/) { return refuse("deleteAttachedFlash"); }
-
-const char* DeviceManager::getDeviceAttribute(int /*position*/, DeviceNS::ATTRIBUTE /*attribute*/) { return nullptr; }
-bool DeviceManager::setDeviceAttribute(int /*position*/, DeviceNS::ATTRIBUTE /*attribute*/, const char* /*value*/,
-                                       bool /*quiet*/) {
-  return refuse("Setting a device attribute");
-}
-bool DeviceManager::setAttribute(int /*position*/, MODE_TYPE /*mode*/, DeviceNS::ATTRIBUTE /*attribute*/,
-                                 const char* /*value*/, bool /*attached*/) {
-  return refuse("Setting an attribute of attached flash");
-}
 bool DeviceManager::setAttribute(ConfigDeviceNS::ATTRIBUTE /*attribute*/, const char* /*value*/) {
   return refuse("Setting a configuration-device attribute");
 }

@@ -19,6 +19,8 @@ make_tree() {
   done
   printf '#include <CLI/CLI.hpp>\n#include "batch/CmdParser.h"\n#include "utility/File.h"\n' >host/main.cpp
   printf '#include "manager/File.h"\n#include "utility/File.h"\n#include "portability/File.h"\n' >manager/File.cpp
+  mkdir manager/scan manager/devices
+  printf '#include "manager/scan/File.h"\n#include "utility/File.h"\n' | tee manager/devices/File.h >manager/scan/File.h
   yes '// a line' | head -n 400 >batch/Long.cpp || true
 }
 
@@ -48,6 +50,8 @@ expect 0 'a tree in order'
 refuse portability/File.h '#include "utility/File.h"' 'portability/ may not include utility/File.h'
 refuse utility/File.h '#include "batch/CmdParser.h"' 'utility/ may not include batch/CmdParser.h'
 refuse manager/File.cpp '#include "pdr/File.h"' 'manager/ may not include pdr/File.h'
+refuse manager/scan/File.h '#include "manager/devices/File.h"' 'manager/scan/ may not include manager/devices/File.h'
+refuse manager/devices/File.h '#include "manager/File.h"' 'manager/devices/ may not include manager/File.h'
 refuse interfaces/File.h '#include "portability/File.h"' 'interfaces/ may not include portability/File.h'
 refuse batch/File.h '#include "manager/File.h"' 'batch/ may not include manager/File.h'
 refuse batch/File.h '  #  include <utility/File.h>' 'batch/ may not include utility/File.h'

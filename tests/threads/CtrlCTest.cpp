@@ -5,6 +5,7 @@
 #include <unistd.h>
 
 #include "tests/threads/TerminalSession.h"
+#include "tests/unit/support/ChildProcess.h"
 
 namespace {
 
@@ -65,6 +66,24 @@ TEST(CtrlC, LetsTheRunningCommandEndAndRefusesTheNextLine) {
   EXPECT_EQ(count(session.output(), "ERROR"), 0U) << "the command did not complete: " << session.output();
   EXPECT_EQ(count(session.output(), "setMbBpiDevice"), 0U) << "the next line ran: " << session.output();
   EXPECT_EQ(count(session.output(), "Sanitizer"), 0U) << session.output();
+}
+
+TEST(CtrlC, LetsAProgrammingRunComeToItsEnd) {
+  TerminalSession session("program");
+  testsupport::ChildProcess board({TESSEL_BOARD, "--listen", "127.0.0.1:0"});
+  const std::string listening = board.readLine();
+  const std::string server = listening.substr(listening.rfind(' ') + 1);
+  session.writeFile("data.bin", std::string(100000, 'x'));
+  session.writeFile("program.cmd", "setMode -bscan\nsetCable -port usb1 -server " + server +
+                                       "\nidentify\nprogram -p 2 -e -v -file data.bin\nerase -p 2\nquit\n");
+  session.start({"--no-log", "program.cmd"});
+  ASSERT_TRUE(session.waitFor("Programming zp20s08")) << session.output();
+  session.type(ctrlC);
+  ASSERT_TRUE(session.waitFor(promise)) << session.output();
+  EXPECT_EQ(count(session.output(), "Verified"), 0U) << "the run was over before the key was pressed";
+  EXPECT_EQ(session.finish(), 1) << session.output();
+  EXPECT_EQ(count(session.output(), "Verified 100000 bytes"), 1U) << session.output();
+  EXPECT_EQ(count(session.output(), "Erasing"), 0U) << "the next line ran: " << session.output();
 }
 
 TEST(CtrlC, AnswersEveryPressAndKeepsABatchLog) {

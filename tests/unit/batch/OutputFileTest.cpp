@@ -12,7 +12,7 @@ using testsupport::readFile;
 
 /// The bundled device manager has no configuration device: it refuses the attribute with this error.
 const testsupport::Message refusal =
-    error("Setting a configuration-device attribute needs devices, which this device manager does not drive yet.\n");
+    error("Setting a configuration-device attribute is not built yet.\n");
 
 class OutputFileTest : public BatchTest {
  protected:

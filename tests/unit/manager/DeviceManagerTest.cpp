@@ -116,12 +116,14 @@ TEST_F(DeviceManagerTest, PreferencesAreValidated) {
   EXPECT_FALSE(manager().setPreference(TesselPreference::recordSteps, "maybe"));
   EXPECT_FALSE(manager().setPreference(TesselPreference::cableLockTries, ""));
   EXPECT_FALSE(manager().setPreference(TesselPreference::unknown, "1"));
-  EXPECT_THAT(messages_.take(),
-              ElementsAre(error("Preference lineWidth can't be \"wide\", expected a number of columns, 0 for no "
-                                "wrapping.\n"),
-                          error("Preference recordSteps can't be \"maybe\", expected true or false.\n"),
-                          error("Preference cableLockTries can't be \"\", expected a number of tries, 1 or more.\n"),
-                          error("Unknown preference. There are: lineWidth recordSteps cableLockTries.\n")));
+  EXPECT_THAT(
+      messages_.take(),
+      ElementsAre(error("Preference lineWidth can't be \"wide\", expected a number of columns, 0 for no "
+                        "wrapping.\n"),
+                  error("Preference recordSteps can't be \"maybe\", expected true or false.\n"),
+                  error("Preference cableLockTries can't be \"\", expected a number of tries, 1 or more.\n"),
+                  error("Unknown preference. There are: lineWidth recordSteps cableLockTries parts_dir eraseFirst "
+                        "verifyAfter.\n")));
   EXPECT_EQ(TesselPreference::getPreferenceObject().getNumber(TesselPreference::cableLockTries), 3);
 }
 
@@ -132,16 +134,23 @@ TEST_F(DeviceManagerTest, TheLineWidthGoesToTheManagerInCharge) {
   EXPECT_EQ(Port_MsgDispatcher::getDefaultMsgMan()->getMaxLineWidth(), 72);
 }
 
-TEST_F(DeviceManagerTest, OnlyTheNullCableOpens) {
+TEST_F(DeviceManagerTest, WithoutAServerOnlyTheNullCableOpens) {
+  const testsupport::ScopedVariable noServer("TESSEL_SERVER", "");
+  const std::string choices =
+      "There are: port null, the simulated board; any port with -server HOST[:PORT], a remote-bitbang server; port "
+      "auto, the server that the environment variable TESSEL_SERVER names.\n";
   EXPECT_FALSE(manager().setCable(nullptr, -1, 9600, true, nullptr, false));
   EXPECT_FALSE(manager().setCable("usb", 0, -1, true, nullptr, false));
+  EXPECT_FALSE(manager().setCable("auto", 0, -1, true, nullptr, false));
   EXPECT_FALSE(manager().setCable("out.svf", -1, 9600, true, "host", true));
-  EXPECT_THAT(messages_.take(),
-              ElementsAre(error("The port word names no cable. Try help -m setCable.\n"),
-                          error("Cable usb can't be opened: this device manager drives no hardware yet. Port null is "
-                                "there.\n"),
-                          error("Cable out.svf can't be opened: this device manager drives no hardware yet. Port null "
-                                "is there.\n")));
+  EXPECT_THAT(
+      messages_.take(),
+      ElementsAre(error("The port word names no cable. " + choices),
+                  error("Cable usb can't be opened: no driver of such hardware is present. " + choices),
+                  error("No cable was found: port auto looked for a server in the environment variable TESSEL_SERVER, "
+                        "which is not set. " +
+                        choices),
+                  error("Cable out.svf can't be opened: cables that write files are not built yet.\n")));
   EXPECT_TRUE(manager().setCable("null", 0, 9600, true, nullptr, false));
   EXPECT_TRUE(manager().setCable("NULL", 0, 9600, true, nullptr, false));
   EXPECT_TRUE(manager().closeCable(false));
@@ -192,10 +201,10 @@ TEST_F(DeviceManagerTest, CleansAStaleLock) {
   EXPECT_THAT(messages_.all(), IsEmpty());
 }
 
-TEST_F(DeviceManagerTest, KnowsOneCableOption) {
+TEST_F(DeviceManagerTest, RefusesCableOptionsThatThereAreNot) {
   EXPECT_FALSE(manager().setCableOption("colour", "true"));
   EXPECT_FALSE(manager().setCableOption("clean_cable_lock", "yes"));
-  EXPECT_THAT(messages_.all(), ElementsAre(error("Unknown cable option colour, expected clean_cable_lock.\n"),
+  EXPECT_THAT(messages_.all(), ElementsAre(error("Unknown cable option colour, expected board or clean_cable_lock.\n"),
                                            error("Cable option clean_cable_lock can't be \"yes\", expected true.\n")));
 }
 

@@ -12,16 +12,8 @@ struct Row {
   std::function<bool(Manager&)> call;
 };
 
+/// A chain that is empty, in a mode that has one.
 const Row deviceRows[] = {
-    {"runCableDiagnostics", [](Manager& m) { return m.runDiagnostics(); }},
-    {"program",
-     [](Manager& m) {
-       const char* words[] = {"program", "-p", "0"};
-       return m.performOperation(3, words);
-     }},
-    {"The operation", [](Manager& m) { return m.performOperation(0, nullptr); }},
-    {"addDevice", [](Manager& m) { return m.addDeviceByPart(0, "marlin3"); }},
-    {"addDevice", [](Manager& m) { return m.addDeviceByFile(0, "a.bit", nullptr, {}); }},
     {"Adding core files",
      [](Manager& m) {
        return m.addCoreFiles(0, {{1, "a.bit"}});
@@ -31,20 +23,18 @@ const Row deviceRows[] = {
     {"clearAdditionalConfigFiles", [](Manager& m) { return m.clearAdditionalConfigFiles(0); }},
     {"assignFile", [](Manager& m) { return m.assignFile(0, "a.bit"); }},
     {"deleteDevice", [](Manager& m) { return m.removeDevice(0); }},
-    {"attachFlash", [](Manager& m) { return m.attachDeviceByPart(0, tESSELNS::SPI_FLASH, "W25Q128"); }},
+    {"attachFlash", [](Manager& m) { return m.attachDeviceByPart(0, tESSELNS::SPI_FLASH, "w25q128"); }},
     {"assignFileToAttachedFlash",
      [](Manager& m) { return m.assignFileToFlashDevice(0, tESSELNS::BPI_FLASH, "a.mcs"); }},
     {"deleteAttachedFlash", [](Manager& m) { return m.deleteAttachedDevice(0); }},
-    {"Setting a device attribute", [](Manager& m) { return m.setDeviceAttribute(0, DeviceNS::KEY, "00", true); }},
-    {"Setting an attribute of attached flash",
-     [](Manager& m) { return m.setAttribute(0, tESSELNS::SPI, DeviceNS::NAME, "x", true); }},
+    {"setAttribute", [](Manager& m) { return m.setDeviceAttribute(0, DeviceNS::KEY, "00", true); }},
+};
+
+const Row contentRows[] = {
     {"Setting a configuration-device attribute",
      [](Manager& m) { return m.setAttribute(ConfigDeviceNS::FILE_NAME, "x"); }},
     {"Setting a collection attribute", [](Manager& m) { return m.setAttribute(CollectionNS::NAME, "x"); }},
     {"Setting a design attribute", [](Manager& m) { return m.setAttribute(DesignNS::NAME, "x"); }},
-};
-
-const Row contentRows[] = {
     {"addCollection", [](Manager& m) { return m.addCollection("c"); }},
     {"deleteCollection", [](Manager& m) { return m.removeCollection("c"); }},
     {"renameCollection", [](Manager& m) { return m.renameCollection("c", "d"); }},
@@ -70,20 +60,33 @@ const Row contentRows[] = {
 
 class RefusalsTest : public ManagerTest {
  protected:
-  void expectRefusal(const Row& row) {
+  void expectRefusal(const Row& row, const std::string& reason) {
     EXPECT_FALSE(row.call(manager())) << row.operation;
-    EXPECT_THAT(messages_.take(),
-                ElementsAre(testsupport::error(std::string(row.operation) +
-                                               " needs devices, which this device manager does not drive yet.\n")));
+    EXPECT_THAT(messages_.take(), ElementsAre(testsupport::error(row.operation + reason)));
   }
 };
 
 TEST_F(RefusalsTest, AnOperationOnDevicesGivesOneErrorThatNamesIt) {
-  for (const Row& row : deviceRows) expectRefusal(row);
+  manager().setMode(tESSELNS::BOUNDARY_SCAN, true);
+  for (const Row& row : deviceRows) expectRefusal(row, ": There is no device 1: the chain is empty.\n");
+}
+
+TEST_F(RefusalsTest, WithoutAModeThereIsNoChain) {
+  for (const Row& row : deviceRows) expectRefusal(row, " needs a mode. Use setMode.\n");
+  manager().setMode(tESSELNS::PROM_FILE_FORMATTER, true);
+  for (const Row& row : deviceRows) expectRefusal(row, " in this mode is not built yet.\n");
+}
+
+TEST_F(RefusalsTest, AWordWithoutAHandlerIsNotBuilt) {
+  const char* words[] = {"expresssvf", "-file", "a.svf"};
+  EXPECT_FALSE(manager().performOperation(3, words));
+  EXPECT_FALSE(manager().performOperation(0, nullptr));
+  EXPECT_THAT(messages_.take(), ElementsAre(testsupport::error("expresssvf is not built yet.\n"),
+                                            testsupport::error("There is no operation without a word.\n")));
 }
 
 TEST_F(RefusalsTest, AnOperationOnContentGivesOneErrorThatNamesIt) {
-  for (const Row& row : contentRows) expectRefusal(row);
+  for (const Row& row : contentRows) expectRefusal(row, " is not built yet.\n");
 }
 
 TEST_F(RefusalsTest, ARefusedOperationLeavesNothingBehind) {

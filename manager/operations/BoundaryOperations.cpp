@@ -1,0 +1,157 @@
+// Words that work on the boundary register, the bypass register and the pins.
+
+#include <algorithm>
+
+#include "manager/content/DataFile.h"
+#include "manager/devices/Registers.h"
+#include "manager/operations/Operation.h"
+#include "manager/operations/RegisterWork.h"
+
+namespace {
+
+constexpr std::size_t patternBits = 64;
+constexpr std::uint64_t pattern = 0xA5C3'0FF0'5A3C'9669;
+
+/// Loads BYPASS everywhere and sees that a pattern comes through.
+Status bypass(DeviceWork& work) {
+  work.status("Putting device into BYPASS...");
+  const std::size_t length = work.device().irLength;
+  TESSEL_TRY(work.scan().loadInstruction(work.index(), BitVector(length, true)));
+  // Every device of the chain delays it by one bit.
+  const std::size_t delay = work.scan().size();
+  BitVector out = BitVector::fromNumber(pattern, patternBits);
+  out.appendFill(delay, false);
+  BitVector expected(delay);
+  expected.append(out, 0, patternBits);
+  BitVector mask(delay);
+  mask.appendFill(patternBits, true);
+  TESSEL_TRY(work.scan().scanData(work.index(), {.out = out, .expected = &expected, .mask = &mask}));
+  work.status("Device is in BYPASS");
+  return {};
+}
+
+/// Loads an instruction that acts on the pins as long as it stays.
+Status loadAndStay(DeviceWork& work, const char* instruction) {
+  const Result<PartPointer> part = work.part();
+  if (!part) return part.failure();
+  work.status("Loading %s...", instruction);
+  TESSEL_TRY(Registers::load(work.scan(), work.index(), **part, instruction));
+  work.status("%s is loaded", instruction);
+  return {};
+}
+
+Status highz(DeviceWork& work) { return loadAndStay(work, "HIGHZ"); }
+Status clamp(DeviceWork& work) { return loadAndStay(work, "CLAMP"); }
+
+/// The values that the part's file calls safe; 0 where any will do.
+BitVector safeValues(const Part& part) {
+  BitVector bits(part.boundary.size());
+  for (std::size_t i = 0; i < part.boundary.size(); ++i) bits.set(i, part.boundary[i].safe == '1');
+  return bits;
+}
+
+/// The bits of -data or -file; the safe values without either.
+Result<BitVector> preloadBits(DeviceWork& work, const Part& part) {
+  const std::size_t length = part.boundary.size();
+  if (const char* data = work.text("-data"))
+    return RegisterWork::bitsOfHex(data, length, Port::format("-data %s", data));
+  const char* file = work.text("-file");
+  if (file == nullptr) return safeValues(part);
+  const Result<DataImage> image = DataFile::read(file, DataFile::formatOf(file).value_or(DataFile::Format::binary));
+  if (!image) return image.failure();
+  if (image->end() > (length + 7) / 8)
+    return Failure{Port::format("%s has %d bytes, the boundary register of %s has %d bits.", file, image->end(),
+                                part.name, length)};
+  BitVector bits = BitVector::fromBytes(image->flatten(0, (length + 7) / 8, 0));
+  bits.resize(length);
+  return bits;
+}
+
+Status doPreload(DeviceWork& work) {
+  const Result<PartPointer> part = work.part();
+  if (!part) return part.failure();
+  if ((*part)->boundary.empty())
+    return Failure{Port::format("%s can't do doPreload: it has no boundary register.", (*part)->name)};
+  const Result<BitVector> bits = preloadBits(work, **part);
+  if (!bits) return bits.failure();
+  const char* instruction = (*part)->opcode("PRELOAD") != nullptr ? "PRELOAD" : "SAMPLE";
+  work.status("Preloading boundary register...");
+  TESSEL_TRY(Registers::load(work.scan(), work.index(), **part, instruction));
+  BitVector pins;
+  TESSEL_TRY(work.scan().scanData(work.index(), {.out = *bits, .in = &pins}));
+  work.status("Preloaded %d bits", bits->size());
+  work.status("Pins are 0x%s", pins.hex());
+  return {};
+}
+
+Status functionTest(DeviceWork& work) {
+  return Failure{
+      Port::format("functionTest of %s needs a player of vector files, which is not built yet.", work.device().name)};
+}
+
+/// The levels that bsdebug drives: those of a switch, its last one held up to `count`.
+Result<BitVector> levelsOf(const UT_CMDARGS& args, const char* name, std::size_t count) {
+  const UT_CMDSWINFO* given = args.getsw(name, 0);
+  if (given == nullptr) return BitVector(count);
+  std::string digits = given->getargtxt(0);
+  // Written in the order of the clocks: the first one is bit 0.
+  std::ranges::reverse(digits);
+  const std::optional<BitVector> bits = BitVector::fromBinary(digits);
+  if (!bits || bits->empty() || bits->size() > count)
+    return Failure{
+        Port::format("%s %s is not what was expected: up to %d levels, 0 or 1.", name, given->getargtxt(0), count)};
+  BitVector levels = *bits;
+  levels.appendFill(count - levels.size(), levels.get(levels.size() - 1));
+  return levels;
+}
+
+std::size_t countOf(const UT_CMDARGS& args) {
+  if (const UT_CMDSWINFO* clocks = args.getsw("-tck", 0))
+    return static_cast<std::size_t>(std::clamp(clocks->getargnum32(0), 0, 1 << 20));
+  std::size_t most = 0;
+  for (const char* name : {"-tms", "-tdi"})
+    if (const UT_CMDSWINFO* given = args.getsw(name, 0))
+      most = std::max(most, std::string_view(given->getargtxt(0)).size());
+  return most;
+}
+
+Status bsdebug(OperationContext& context, const UT_CMDARGS& args) {
+  if (args.findsw("-start") || args.findsw("-reset")) {
+    TESSEL_TRY(context.cable.goTo(TapState::reset));
+    reportStatus("TAPs are in Test-Logic-Reset\n");
+  }
+  const std::size_t count = countOf(args);
+  if (count > 0) {
+    const Result<BitVector> tms = levelsOf(args, "-tms", count);
+    if (!tms) return tms.failure();
+    const Result<BitVector> tdi = levelsOf(args, "-tdi", count);
+    if (!tdi) return tdi.failure();
+    const UT_CMDSWINFO* loop = args.getsw("-loop", 0);
+    const int times = loop == nullptr ? 1 : std::clamp(loop->getargnum32(0), 0, 1 << 16);
+    for (int i = 0; i < times; ++i) {
+      BitVector tdo;
+      TESSEL_TRY(context.cable.clock(*tms, *tdi, &tdo));
+      std::string levels = tdo.binary();
+      std::ranges::reverse(levels);
+      reportStatus("TDO is %s\n", levels);
+    }
+  }
+  if (args.findsw("-stop")) {
+    TESSEL_TRY(context.cable.goTo(TapState::reset));
+    reportStatus("TAPs are in Test-Logic-Reset\n");
+  }
+  return context.cable.flush();
+}
+
+constexpr OperationRow rows[] = {
+    {"bypass", bypass, false},
+    {"highz", highz},
+    {"clamp", clamp},
+    {"doPreload", doPreload},
+    {"functionTest", functionTest},
+    {"bsdebug", nullptr, false, bsdebug},
+};
+
+}  // namespace
+
+const std::span<const OperationRow> boundaryOperations = rows;
