@@ -10,7 +10,8 @@ seconds=${1:-30}
 [[ $seconds =~ ^[0-9]+$ ]] || fail "Expected a number of seconds, not $seconds"
 [[ $# -eq 0 ]] || shift
 names=("$@")
-[[ ${#names[@]} -gt 0 ]] || names=(LinesFuzzer TableFuzzer PdrFuzzer SessionFuzzer)
+[[ ${#names[@]} -gt 0 ]] || names=(LinesFuzzer TableFuzzer PdrFuzzer SessionFuzzer
+  BsdlFuzzer DataFileFuzzer BoardFuzzer StateFuzzer ServerFuzzer RemoteCableFuzzer)
 
 # The first Clang of Debian 12 that knows all of the language that we use.
 install_missing "${build_packages[@]}" clang-16 libclang-rt-16-dev
@@ -31,12 +32,14 @@ fi
 # Runs one fuzzer and shows the end of what it says, or all that matters when it fails.
 run_fuzzer() {
   local name=$1 log=$built/$1.log
-  local found=$built/corpus/$name
+  local found=$built/corpus/$name seeds=$root/tests/fuzz/corpus/$name dictionary=$root/tests/fuzz/$name.dict
+  local options=()
   mkdir -p "$found"
+  [[ ! -e $dictionary ]] || options+=(-dict="$dictionary")
+  [[ -d $seeds ]] || seeds=()
   say "$name for $seconds s; its output is in $log"
   if "$built/bin/$name" -max_total_time="$seconds" -rss_limit_mb=2048 -timeout=10 -print_final_stats=1 \
-    -artifact_prefix="$built/artifacts/$name-" -dict="$root/tests/fuzz/$name.dict" \
-    "$found" "$root/tests/fuzz/corpus/$name" >"$log" 2>&1; then
+    -artifact_prefix="$built/artifacts/$name-" "${options[@]}" "$found" "${seeds[@]}" >"$log" 2>&1; then
     grep -a -E 'DONE|stat::(number_of_executed_units|average_exec_per_sec)' "$log"
     return 0
   fi
@@ -44,9 +47,19 @@ run_fuzzer() {
   return 1
 }
 
+# As many at a time as there are processors; what each says comes when it is done.
 failed=()
-for name in "${names[@]}"; do
-  run_fuzzer "$name" || failed+=("$name")
+for ((first = 0; first < ${#names[@]}; first += $(nproc))); do
+  group=("${names[@]:first:$(nproc)}")
+  processes=()
+  for name in "${group[@]}"; do
+    run_fuzzer "$name" >"$scratch/$name.said" 2>&1 &
+    processes+=("$!")
+  done
+  for i in "${!group[@]}"; do
+    wait "${processes[i]}" || failed+=("${group[i]}")
+    cat "$scratch/${group[i]}.said"
+  done
 done
 [[ ${#failed[@]} -eq 0 ]] || fail "${failed[*]}: see build/fuzz/artifacts"
 say "No fuzzer found anything"

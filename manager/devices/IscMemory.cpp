@@ -51,18 +51,18 @@ const IscMemory::Actions IscMemory::configurationActions = {"configure", "config
                                                             "configure_erase"};
 
 Result<std::unique_ptr<Memory>> makeIscMemory(ScanChain& chain, std::size_t device, PartPointer part) {
-  return IscMemory::make(chain, device, part);
+  return IscMemory::make(chain, device, std::move(part));
 }
 
-Result<std::unique_ptr<Memory>> IscMemory::make(ScanChain& chain, std::size_t device, const PartPointer& part) {
+Result<std::unique_ptr<Memory>> IscMemory::make(ScanChain& chain, std::size_t device, PartPointer part) {
   if (part->isc.empty()) return Failure{.text = part->name + " has no ISC actions, so it can't be programmed"};
-  auto memory = std::unique_ptr<IscMemory>(new IscMemory(chain, device, part));
-  Result<Region> own = region(*part, memoryActions);
+  auto memory = std::unique_ptr<IscMemory>(new IscMemory(chain, device, std::move(part)));
+  Result<Region> own = region(*memory->part_, memoryActions);
   if (!own) return own.failure();
   memory->memory_ = *own;
   memory->configuration_ = *own;
-  if (part->isc.findAction(configurationActions.program) != nullptr) {
-    Result<Region> other = region(*part, configurationActions);
+  if (memory->part_->isc.findAction(configurationActions.program) != nullptr) {
+    Result<Region> other = region(*memory->part_, configurationActions);
     if (!other) return other.failure();
     memory->configuration_ = *other;
   }

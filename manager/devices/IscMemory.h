@@ -10,7 +10,7 @@
 /// A device's own memory, erased, programmed, verified and read as the ISC actions of its part say.
 class IscMemory : public Memory {
  public:
-  static Result<std::unique_ptr<Memory>> make(ScanChain& chain, std::size_t device, const PartPointer& part);
+  static Result<std::unique_ptr<Memory>> make(ScanChain& chain, std::size_t device, PartPointer part);
 
   Status open() override;
   std::uint64_t size() const override { return sizeOf(memory_); }

@@ -1,12 +1,10 @@
 #include "manager/manager/CableLock.h"
 
-#include <cctype>
 #include <chrono>
-#include <functional>
 #include <thread>
 
-#include "interfaces/portability/FormatArgument.h"
 #include "interfaces/portability/OwnedFile.h"
+#include "manager/support/LockFile.h"
 #include "manager/support/Report.h"
 
 namespace {
@@ -20,33 +18,16 @@ bool refuse(const std::string& path, const Port::OwnedFile::Owner& owner) {
                      path, owner.process);
 }
 
-/// A name that may stand in a file name; what is long or odd is told apart by its hash.
-std::string fileName(const std::string& name) {
-  constexpr std::size_t longest = 60;
-  std::string result;
-  for (const char each : name) {
-    const bool plain = std::isalnum(static_cast<unsigned char>(each)) != 0 || each == '.' || each == '-';
-    result += plain ? each : '_';
-  }
-  if (result.size() > longest) result.erase(0, result.size() - longest);
-  return result + Port::format("-%08x", static_cast<std::uint32_t>(std::hash<std::string>()(name)));
-}
-
 }  // namespace
 
-CableLock::CableLock() : CableLock(Port::OwnedFile::runtimeDirectory() + "/cable.lock") {}
+CableLock::CableLock() : CableLock(LockFile::commonPath()) {}
 
 CableLock::CableLock(std::string path) : path_(path), commonPath_(std::move(path)) {}
 
 CableLock::~CableLock() { unlock(); }
 
 void CableLock::use(const std::string& cable) {
-  std::string path = commonPath_;
-  if (!cable.empty()) {
-    const std::string ending = ".lock";
-    path.resize(path.size() - ending.size());
-    path += "-" + fileName(cable) + ending;
-  }
+  const std::string path = LockFile::path(commonPath_, cable);
   if (path == path_) return;
   unlock();
   path_ = path;

@@ -12,20 +12,24 @@ namespace {
 constexpr std::size_t patternBits = 64;
 constexpr std::uint64_t pattern = 0xA5C3'0FF0'5A3C'9669;
 
-/// Loads BYPASS everywhere and sees that a pattern comes through.
-Status bypass(DeviceWork& work) {
-  work.status("Putting device into BYPASS...");
-  const std::size_t length = work.device().irLength;
-  TESSEL_TRY(work.scan().loadInstruction(work.index(), BitVector(length, true)));
-  // Every device of the chain delays it by one bit.
-  const std::size_t delay = work.scan().size();
+/// Shifts a pattern through the device's selected register, of `length` bits, and sees that it comes out again.
+Status testRegister(DeviceWork& work, std::size_t length) {
+  // Every other device of the chain delays it by one bit more.
+  const std::size_t delay = length + work.scan().size() - 1;
   BitVector out = BitVector::fromNumber(pattern, patternBits);
   out.appendFill(delay, false);
   BitVector expected(delay);
   expected.append(out, 0, patternBits);
   BitVector mask(delay);
   mask.appendFill(patternBits, true);
-  TESSEL_TRY(work.scan().scanData(work.index(), {.out = out, .expected = &expected, .mask = &mask}));
+  return work.scan().scanData(work.index(), {.out = out, .expected = &expected, .mask = &mask});
+}
+
+/// Loads BYPASS everywhere and sees that a pattern comes through.
+Status bypass(DeviceWork& work) {
+  work.status("Putting device into BYPASS...");
+  TESSEL_TRY(work.scan().loadInstruction(work.index(), BitVector(work.device().irLength, true)));
+  TESSEL_TRY(testRegister(work, 1));
   work.status("Device is in BYPASS");
   return {};
 }
@@ -84,9 +88,23 @@ Status doPreload(DeviceWork& work) {
   return {};
 }
 
+/// The registers that every device has, tested with a pattern; the pins stay as they are.
 Status functionTest(DeviceWork& work) {
-  return Failure{
-      Port::format("functionTest of %s needs a player of vector files, which is not built yet.", work.device().name)};
+  if (work.has("-file"))
+    return Failure{"functionTest with a file needs a player of vector files, which is not built yet."};
+  const Result<PartPointer> part = work.part();
+  if (!part) return part.failure();
+  work.status("Testing registers...");
+  TESSEL_TRY(Registers::load(work.scan(), work.index(), **part, "BYPASS"));
+  TESSEL_TRY(testRegister(work, 1));
+  work.status("Bypass register of 1 bit passed");
+  const char* instruction = (*part)->opcode("SAMPLE") != nullptr ? "SAMPLE" : "PRELOAD";
+  if (!(*part)->boundary.empty() && (*part)->opcode(instruction) != nullptr) {
+    TESSEL_TRY(Registers::load(work.scan(), work.index(), **part, instruction));
+    TESSEL_TRY(testRegister(work, (*part)->boundary.size()));
+    work.status("Boundary register of %d bits passed", (*part)->boundary.size());
+  }
+  return {};
 }
 
 /// The levels that bsdebug drives: those of a switch, its last one held up to `count`.

@@ -80,13 +80,27 @@ Entry readCell(BsdlTextCursor& cursor) {
 
 std::string cellName(std::size_t number) { return "boundary cell " + std::to_string(number); }
 
-/// What is wrong with the numbers of an entry; empty when nothing is.
-std::string problem(const Entry& entry, const std::vector<bool>& given) {
+bool observes(const BoundaryCell& cell) {
+  return cell.function == "input" || cell.function == "clock" || cell.function == "observe_only";
+}
+
+/// Puts an entry into the register. A number may stand for two ports once: one that the cell observes, and one that
+/// it drives. Gives what is wrong with the numbers; empty when nothing is.
+std::string take(Entry& entry, std::vector<BoundaryCell>& cells, std::vector<int>& given) {
   const std::string outside = " is outside: the register has " + std::to_string(given.size()) + " cells";
   if (entry.number >= given.size()) return cellName(entry.number) + outside;
   if (entry.cell.control >= static_cast<int>(given.size()))
     return "the control cell of " + cellName(entry.number) + outside;
-  return given[entry.number] ? cellName(entry.number) + " is given twice" : "";
+  BoundaryCell& cell = cells[entry.number];
+  const int times = given[entry.number]++;
+  if (times == 0) {
+    cell = std::move(entry.cell);
+    return "";
+  }
+  if (times > 1 || observes(cell) == observes(entry.cell)) return cellName(entry.number) + " is given twice";
+  if (observes(cell)) std::swap(cell, entry.cell);
+  cell.observedPort = std::move(entry.cell.port);
+  return "";
 }
 
 }  // namespace
@@ -103,16 +117,14 @@ std::vector<BoundaryCell> readBoundaryRegister(BsdlSource& source, const BsdlTex
   if (length == 0)
     for (const Entry& entry : entries) length = std::max(length, entry.number + 1);
   std::vector<BoundaryCell> cells(length);
-  std::vector<bool> given(length);
+  std::vector<int> given(length);
   for (Entry& entry : entries) {
-    if (const std::string why = problem(entry, given); !why.empty()) {
+    if (const std::string why = take(entry, cells, given); !why.empty()) {
       cursor.fail(entry.place, why);
       return {};
     }
-    given[entry.number] = true;
-    cells[entry.number] = std::move(entry.cell);
   }
-  const auto missing = std::find(given.begin(), given.end(), false);
+  const auto missing = std::find(given.begin(), given.end(), 0);
   if (missing != given.end())
     source.fail(offset, cellName(static_cast<std::size_t>(missing - given.begin())) + " is missing");
   return cells;

@@ -28,6 +28,7 @@ struct BoundaryCell {
   char safe = 'X';   ///< 0, 1 or X
   int control = -1;  ///< the cell that disables this one; -1 for none
   char disableValue = 'X';
+  std::string observedPort;   ///< of a cell that drives one port and observes another: the latter
   std::string disableResult;  ///< upper case: Z, WEAK0, WEAK1, PULL0, PULL1, KEEPER
 };
 

@@ -48,7 +48,8 @@ void AmdFlash::write(std::uint32_t address, std::uint16_t data) {
     state_ = isCommandAddress(address, unlockAddress1) && data == unlockData1 ? State::erase2 : State::array;
     return;
   }
-  (this->*steps[static_cast<int>(state_)])(address, data);
+  const Step step = steps[static_cast<std::size_t>(state_)];
+  (this->*step)(address, data);
 }
 
 void AmdFlash::begin(std::uint32_t address, std::uint16_t data) {

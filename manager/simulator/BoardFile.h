@@ -10,7 +10,7 @@
 /// Reads board files (docs/boards.md).
 namespace BoardFile {
 
-inline constexpr std::uint64_t mostBytes = 16 << 20;
+inline constexpr std::uint64_t mostBytes = std::uint64_t{16} << 20;
 inline constexpr std::size_t mostDevices = 256;
 /// Of all memories of a board together, in bytes.
 inline constexpr std::uint64_t mostMemory = std::uint64_t{1} << 30;

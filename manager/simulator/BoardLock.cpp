@@ -1,26 +1,14 @@
 #include "manager/simulator/BoardLock.h"
 
-#include <cctype>
-#include <functional>
-
-#include "interfaces/portability/FormatArgument.h"
 #include "interfaces/portability/OwnedFile.h"
+#include "manager/support/LockFile.h"
 
 BoardLock::~BoardLock() {
   if (!path_.empty()) Port::OwnedFile::remove(path_);
 }
 
 std::string BoardLock::pathOf(const std::string& lockName) {
-  constexpr std::size_t longest = 60;
-  const std::string name = "board " + lockName;
-  std::string plain;
-  for (const char each : name) {
-    const bool kept = std::isalnum(static_cast<unsigned char>(each)) != 0 || each == '.' || each == '-';
-    plain += kept ? each : '_';
-  }
-  if (plain.size() > longest) plain.erase(0, plain.size() - longest);
-  plain += Port::format("-%08x", static_cast<std::uint32_t>(std::hash<std::string>()(name)));
-  return Port::OwnedFile::runtimeDirectory() + "/cable-" + plain + ".lock";
+  return LockFile::path(LockFile::commonPath(), "board " + lockName);
 }
 
 Status BoardLock::take(const std::string& lockName) {

@@ -9,14 +9,15 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <charconv>
 #include <cstring>
 #include <span>
 
 namespace {
 
-constexpr std::size_t inputBytes = 256 * 1024;
+constexpr std::size_t inputBytes = std::size_t{256} * 1024;
 /// A client that does not fetch its answers is read no further from here on.
-constexpr std::size_t mostQueued = 64 << 20;
+constexpr std::size_t mostQueued = std::size_t{64} << 20;
 constexpr std::chrono::seconds patienceWithRest{5};
 
 struct FreeAddresses {
@@ -25,6 +26,14 @@ struct FreeAddresses {
 using Addresses = std::unique_ptr<addrinfo, FreeAddresses>;
 
 Failure systemFailure(const std::string& what, int error) { return {.text = what + ": " + std::strerror(error)}; }
+
+/// The system's own reading takes any number, modulo what fits.
+bool isPort(const std::string& text) {
+  unsigned number = 0;
+  const char* end = text.data() + text.size();
+  const auto [behind, problem] = std::from_chars(text.data(), end, number);
+  return problem == std::errc() && behind == end && number <= 65535;
+}
 
 std::string addressOf(int socket) {
   sockaddr_storage address{};
@@ -69,6 +78,7 @@ BoardServer::BoardServer(SimulatedBoard& board) : board_(board), input_(inputByt
 }
 
 Status BoardServer::listen(const std::string& host, const std::string& port) {
+  if (!isPort(port)) return Failure{"can't listen on " + host + ":" + port + ": a port is a number up to 65535"};
   addrinfo wanted{};
   wanted.ai_socktype = SOCK_STREAM;
   wanted.ai_flags = AI_PASSIVE;

@@ -33,7 +33,8 @@ void IntelFlash::write(std::uint32_t address, std::uint16_t data) {
   static constexpr Step steps[] = {&IntelFlash::command,    &IntelFlash::eraseConfirm, &IntelFlash::programData,
                                    &IntelFlash::lockAction, &IntelFlash::count,        &IntelFlash::fill,
                                    &IntelFlash::confirm};
-  if (!busy()) (this->*steps[static_cast<int>(await_)])(address, data);
+  const Step step = steps[static_cast<std::size_t>(await_)];
+  if (!busy()) (this->*step)(address, data);
 }
 
 void IntelFlash::reset() {

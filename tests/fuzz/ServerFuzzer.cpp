@@ -45,7 +45,8 @@ class PlainDecoder {
 std::unique_ptr<SimulatedBoard> makeBoard() {
   static PartLibrary parts;
   auto board = SimulatedBoard::parse(
-      "board", R"({"chain": [{"part": "zp18v01"}, {"part": "marlin3-1", "spi": {"part": "m25p05"}}, {"part": "mullet-32"}],
+      "board",
+      R"({"chain": [{"part": "zp18v01"}, {"part": "marlin3-1", "spi": {"part": "m25p05"}}, {"part": "mullet-32"}],
                   "faults": {"flipTdo": {"rate": 0.001, "seed": 1}}})",
       "", parts);
   require(board.ok(), "the board is right");

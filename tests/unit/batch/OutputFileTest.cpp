@@ -11,8 +11,7 @@ using testsupport::error;
 using testsupport::readFile;
 
 /// The bundled device manager has no configuration device: it refuses the attribute with this error.
-const testsupport::Message refusal =
-    error("Setting a configuration-device attribute is not built yet.\n");
+const testsupport::Message refusal = error("Setting a configuration-device attribute is not built yet.\n");
 
 class OutputFileTest : public BatchTest {
  protected:

@@ -166,6 +166,22 @@ TEST(BsdlFileTest, attributesMayComeInAnyOrder) {
   EXPECT_EQ(access(*part, "EXTEST"), "BOUNDARY 1");
 }
 
+TEST(BsdlFileTest, aCellMayDriveOnePortAndObserveAnother) {
+  const auto part = BsdlFile::parse("a.bsd",
+                                    "entity a is\n"
+                                    "attribute INSTRUCTION_LENGTH of a : entity is 3;\n"
+                                    "attribute BOUNDARY_LENGTH of a : entity is 2;\n"
+                                    "attribute BOUNDARY_REGISTER of a : entity is\n"
+                                    "\"0 (BC_1, A, input, X), 0 (BC_1, B, output2, 0), 1 (BC_1, C, output2, 1)\";\n"
+                                    "end a;\n");
+  ASSERT_TRUE(part.ok()) << part.failure().text;
+  ASSERT_EQ(part->boundary.size(), 2U);
+  EXPECT_EQ(part->boundary[0].port, "B");
+  EXPECT_EQ(part->boundary[0].function, "output2");
+  EXPECT_EQ(part->boundary[0].observedPort, "A");
+  EXPECT_EQ(part->boundary[1].observedPort, "");
+}
+
 TEST(BsdlFileTest, aMissingFileIsAFailure) {
   const auto part = BsdlFile::read("/nowhere/part.bsd");
   ASSERT_FALSE(part);

@@ -1,9 +1,8 @@
-#include "manager/simulator/BitbangDecoder.h"
-
 #include <gtest/gtest.h>
 
 #include <random>
 
+#include "manager/simulator/BitbangDecoder.h"
 #include "tests/unit/manager/simulator/Jtag.h"
 
 namespace {
@@ -61,13 +60,14 @@ Bytes randomSession(std::mt19937& random) {
   for (int part = 0; part < 60; ++part) {
     if (random() % 4 == 0) {
       const std::string any = "01234567RRBbrstux\n";
-      for (std::size_t i = random() % 12; i > 0; --i) bytes.push_back(static_cast<std::uint8_t>(any[random() % any.size()]));
+      for (std::size_t i = random() % 12; i > 0; --i)
+        bytes.push_back(static_cast<std::uint8_t>(any[random() % any.size()]));
       bytes.push_back('r');
       continue;
     }
     const std::size_t length = random() % 3 == 0 ? 1 + random() % 300 : 1 + random() % 4;
-    const Bytes run = clocks(BitVector(length, random() % 2 == 0), randomBits(length, random()),
-                             static_cast<Order>(random() % 3));
+    const Bytes run =
+        clocks(BitVector(length, random() % 2 == 0), randomBits(length, random()), static_cast<Order>(random() % 3));
     bytes.insert(bytes.end(), run.begin(), run.end());
   }
   return bytes;
@@ -106,7 +106,9 @@ TEST(BitbangDecoder, BothOrdersReadTheIdcodes) {
     TestBoard test(chain);
     BitbangDecoder decoder(*test.board);
     Bytes answers;
-    const BitVector path = *BitVector::fromBinary("0010" "11111");  // reset, then to Shift-DR
+    const BitVector path = *BitVector::fromBinary(
+        "0010"
+        "11111");  // reset, then to Shift-DR
     decoder.feed(clocks(path, BitVector(path.size()), Order::noRead), answers);
     EXPECT_TRUE(answers.empty());
     ASSERT_EQ(test.board->state(), TapState::drShift);
@@ -125,7 +127,11 @@ TEST(BitbangDecoder, TdoStaysUntilTheFall) {
   TestBoard test(chain);
   BitbangDecoder decoder(*test.board);
   Bytes answers;
-  decoder.feed(bytesOf("262626262604" "2604" "04" "0"), answers);
+  decoder.feed(bytesOf("262626262604"
+                       "2604"
+                       "04"
+                       "0"),
+               answers);
   ASSERT_EQ(test.board->state(), TapState::drShift);
   // The first bit of an IDCODE is 1, the second of these parts' is 0: the rise does not change what is read.
   decoder.feed(bytesOf("RR4RR0RR"), answers);

@@ -1,10 +1,8 @@
-#include "manager/simulator/BoardFile.h"
-
 #include <gtest/gtest.h>
 
 #include <filesystem>
 
-
+#include "manager/simulator/BoardFile.h"
 #include "tests/unit/manager/simulator/Jtag.h"
 #include "tests/unit/support/Files.h"
 
@@ -95,8 +93,7 @@ TEST(BoardFile, TheMemoriesOfABoardAreBounded) {
   std::string text = R"({"chain": [)";
   for (int i = 0; i < 100; ++i)
     text += std::string(i > 0 ? "," : "") + R"({"part": "marlin3-1", "spi": {"part": "mt25ql02g"}})";
-  EXPECT_EQ(failureOf(text + "]}"),
-            "board.json: chain[3]: the memories up to here are larger than 2^30 bytes in all");
+  EXPECT_EQ(failureOf(text + "]}"), "board.json: chain[3]: the memories up to here are larger than 2^30 bytes in all");
 }
 
 TEST(BoardFile, MissingFilesAreNamed) {

@@ -1,5 +1,3 @@
-#include "manager/simulator/BoardServer.h"
-
 #include <arpa/inet.h>
 #include <gtest/gtest.h>
 #include <netinet/in.h>
@@ -9,6 +7,7 @@
 #include <chrono>
 #include <thread>
 
+#include "manager/simulator/BoardServer.h"
 #include "tests/unit/manager/simulator/Jtag.h"
 
 namespace {
@@ -63,7 +62,9 @@ std::string repeat(const std::string& text, std::size_t count) {
 }
 
 /// To Shift-DR from anywhere: the IDCODEs come out then.
-const std::string toIdcodes = "2626262626042604" "04";
+const std::string toIdcodes =
+    "2626262626042604"
+    "04";
 
 /// A board that a thread serves.
 class Served {
@@ -197,17 +198,23 @@ TEST(BoardServer, RealTimePassesOnTheBoard) {
   const Handle client = served.connect();
   // ISC_ENABLE with its code and ISC_ERASE with its in the device next to TDO, then its status.
   const auto ir = [](const std::string& opcode) {  // bits as they are shifted
-    std::string bytes = "2626" "0404";
+    std::string bytes =
+        "2626"
+        "0404";
     const std::string bits = opcode + "11111111";
     for (std::size_t i = 0; i < bits.size(); ++i) {
       const int level = (bits[i] - '0') + (i + 1 == bits.size() ? 2 : 0);
       bytes += static_cast<char>('0' + level);
       bytes += static_cast<char>('4' + level);
     }
-    return bytes + "26" "04";
+    return bytes +
+           "26"
+           "04";
   };
   const auto dr = [](std::string bits, const std::string& clock) {
-    std::string bytes = "26" "0404";
+    std::string bytes =
+        "26"
+        "0404";
     bits += "0";
     for (std::size_t i = 0; i < bits.size(); ++i) {
       const int level = (bits[i] - '0') + (i + 1 == bits.size() ? 2 : 0);
@@ -215,7 +222,9 @@ TEST(BoardServer, RealTimePassesOnTheBoard) {
       if (clock == "read") bytes += 'R';
       bytes += static_cast<char>('4' + level);
     }
-    return bytes + "26" "04";
+    return bytes +
+           "26"
+           "04";
   };
   send(client, "262626262604" + ir("11100001") + dr("00001011", "") + ir("11000010") + dr("10100101", ""));
   const auto status = [&] {
@@ -249,5 +258,10 @@ TEST(BoardServer, APortInUseIsAFailureThatNamesIt) {
   const Status listening = server.listen("127.0.0.1", port);
   ASSERT_FALSE(listening.ok());
   EXPECT_EQ(listening.failure().text, "can't listen on 127.0.0.1:" + port + ": Address already in use");
-  EXPECT_FALSE(server.listen("127.0.0.1", "none").ok());
+  for (const char* bad : {"none", "65536", "-1", "80x", ""}) {
+    const Status refused = server.listen("127.0.0.1", bad);
+    ASSERT_FALSE(refused.ok()) << bad;
+    EXPECT_EQ(refused.failure().text,
+              std::string("can't listen on 127.0.0.1:") + bad + ": a port is a number up to 65535");
+  }
 }

@@ -37,7 +37,7 @@ class BpiFlashBoard : public testing::Test {
   }
   std::uint16_t word(std::uint32_t address) {
     const std::vector<std::uint8_t> bytes = test_.board->bpiMemory(0);
-    return static_cast<std::uint16_t>(bytes[address * 2] | bytes[address * 2 + 1] << 8);
+    return static_cast<std::uint16_t>(bytes[std::size_t{address} * 2] | bytes[std::size_t{address} * 2 + 1] << 8);
   }
   std::uint32_t sectorWords() const { return part_.sectorSize / 2; }
 

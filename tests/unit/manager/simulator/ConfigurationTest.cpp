@@ -71,7 +71,8 @@ TEST_P(Fpga, StartsUpOnAValidBitstreamAndGoesOnRunning) {
 
 TEST_P(Fpga, RefusesEveryDamage) {
   const std::vector<std::uint8_t> good = bitstream(1);
-  for (const std::size_t place : {std::size_t{0}, std::size_t{5}, std::size_t{9}, std::size_t{70000}, good.size() - 1}) {
+  for (const std::size_t place :
+       {std::size_t{0}, std::size_t{5}, std::size_t{9}, std::size_t{70000}, good.size() - 1}) {
     std::vector<std::uint8_t> bad = good;
     bad[place] ^= 0x10;
     enable();
@@ -140,8 +141,8 @@ TEST(FpgaFamily, FlashInsideIsLoadedOnDemandAndHasAnErasureOfItsOwn) {
   TestBoard test(R"({"chain": [{"part": "marlin3an-1"}]})");
   Jtag jtag(*test.board, findParts(test.parts, {"marlin3an-1"}));
   const auto status = [&] { return jtag.access(0, "ISC_STATUS", 0, 8); };
-  const BitVector bits = BitVector::fromBytes(
-      Bitstream::make(idcodeOf(**test.parts.find("marlin3an-1")), memoryBits / 8, 0x99, {}));
+  const BitVector bits =
+      BitVector::fromBytes(Bitstream::make(idcodeOf(**test.parts.find("marlin3an-1")), memoryBits / 8, 0x99, {}));
   jtag.load(0, "CFG_LOAD");
   EXPECT_EQ(status(), error) << "an empty flash starts nothing";
   jtag.access(0, "ISC_ENABLE", 0xD0, 8);

@@ -53,7 +53,8 @@ TEST(Faults, NoiseFlipsBitsAtItsRate) {
 }
 
 TEST(Faults, NoiseIsTheSameForTheSameSeedHoweverItIsClocked) {
-  const std::string text = withFaults(R"({"flipTdo": {"rate": 0.05, "seed": 5}, "flipTdi": {"rate": 0.02, "seed": 9}})");
+  const std::string text =
+      withFaults(R"({"flipTdo": {"rate": 0.05, "seed": 5}, "flipTdi": {"rate": 0.02, "seed": 9}})");
   TestBoard inRuns(text);
   TestBoard inSteps(text);
   TestBoard otherSeed(withFaults(R"({"flipTdo": {"rate": 0.05, "seed": 6}, "flipTdi": {"rate": 0.02, "seed": 9}})"));

@@ -9,7 +9,7 @@ namespace {
 constexpr std::size_t pageBits = 2048;
 constexpr std::uint64_t busy = 1, error = 4, enabled = 8, readProtected = 16, writeProtected = 32;
 
-class Isc : public testing::Test {
+class IscDevice : public testing::Test {
  protected:
   void SetUp() override { ASSERT_NE(test_.board, nullptr) << test_.failure; }
 
@@ -38,7 +38,7 @@ class Isc : public testing::Test {
 
 }  // namespace
 
-TEST_F(Isc, CapturesItsPatternAndCodes) {
+TEST_F(IscDevice, CapturesItsPatternAndCodes) {
   const BitVector captured = jtag_.load(0, "IDCODE");
   EXPECT_EQ(captured.number(0, 2), 0b01U);
   EXPECT_TRUE((*test_.parts.find("zp18v01"))->matchesIdcode(jtag_.data(0, BitVector(32))));
@@ -49,7 +49,7 @@ TEST_F(Isc, CapturesItsPatternAndCodes) {
   EXPECT_EQ(jtag_.data(0, 0b1011, 4), 0b1100U) << "an unknown opcode selects BYPASS";
 }
 
-TEST_F(Isc, ProgramsReadsAndErasesPages) {
+TEST_F(IscDevice, ProgramsReadsAndErasesPages) {
   const BitVector bits = randomBits(pageBits, 1);
   enable();
   program(5, bits);
@@ -61,7 +61,7 @@ TEST_F(Isc, ProgramsReadsAndErasesPages) {
   EXPECT_EQ(read(5), BitVector(pageBits, true));
 }
 
-TEST_F(Isc, ProgrammingOnlyClearsBits) {
+TEST_F(IscDevice, ProgrammingOnlyClearsBits) {
   enable();
   BitVector first(pageBits, true);
   first.setNumber(0, 4, 0b0011);
@@ -72,7 +72,7 @@ TEST_F(Isc, ProgrammingOnlyClearsBits) {
   EXPECT_EQ(read(0).number(0, 8), 0b11110001U);
 }
 
-TEST_F(Isc, NeedsToBeEnabledWithTheRightCode) {
+TEST_F(IscDevice, NeedsToBeEnabledWithTheRightCode) {
   program(1, BitVector(pageBits));
   EXPECT_EQ(status(), error);
   jtag_.access(0, "ISC_ENABLE", 0xD1, 8);
@@ -85,7 +85,7 @@ TEST_F(Isc, NeedsToBeEnabledWithTheRightCode) {
   EXPECT_EQ(status(), 0U);
 }
 
-TEST_F(Isc, ErasesOnlyWithTheRightCode) {
+TEST_F(IscDevice, ErasesOnlyWithTheRightCode) {
   enable();
   program(1, BitVector(pageBits));
   jtag_.access(0, "ISC_ERASE", 0xA4, 8);
@@ -94,7 +94,7 @@ TEST_F(Isc, ErasesOnlyWithTheRightCode) {
   EXPECT_EQ(read(1), BitVector(pageBits));
 }
 
-TEST_F(Isc, IsBusyForItsTimes) {
+TEST_F(IscDevice, IsBusyForItsTimes) {
   enable();
   jtag_.access(0, "ISC_ERASE", 0xA5, 8);
   EXPECT_EQ(status(), enabled | busy);
@@ -105,13 +105,13 @@ TEST_F(Isc, IsBusyForItsTimes) {
   EXPECT_EQ(status(), enabled | error);
 }
 
-TEST_F(Isc, AnAddressBeyondTheEndIsAnError) {
+TEST_F(IscDevice, AnAddressBeyondTheEndIsAnError) {
   enable();
   program(512, BitVector(pageBits));
   EXPECT_EQ(status(), enabled | error);
 }
 
-TEST_F(Isc, SecurityBitsProtectUntilTheErasure) {
+TEST_F(IscDevice, SecurityBitsProtectUntilTheErasure) {
   enable();
   const BitVector bits = randomBits(pageBits, 2);
   program(3, bits);
@@ -131,7 +131,7 @@ TEST_F(Isc, SecurityBitsProtectUntilTheErasure) {
   EXPECT_EQ(jtag_.access(0, "USERCODE", 0, 32), 0xFFFFFFFFU);
 }
 
-TEST_F(Isc, NamedRegistersKeepWhatIsWritten) {
+TEST_F(IscDevice, NamedRegistersKeepWhatIsWritten) {
   jtag_.access(0, "ISC_PROGRAM_USERCODE", 0xCAFE1234, 32);
   EXPECT_EQ(jtag_.access(0, "USERCODE", 0, 32), 0xCAFE1234U);
   jtag_.access(0, "ISC_PROGRAM_UES", 0x123456789ABCDEF0, 64);
@@ -140,7 +140,7 @@ TEST_F(Isc, NamedRegistersKeepWhatIsWritten) {
   EXPECT_EQ(jtag_.access(0, "READ_MFG_CODE", 0, 32), code) << "reading must not write";
 }
 
-TEST_F(Isc, TestLogicResetEndsTheIscMode) {
+TEST_F(IscDevice, TestLogicResetEndsTheIscMode) {
   enable();
   jtag_.reset();
   EXPECT_EQ(status(), 0U);

@@ -44,7 +44,7 @@ class SpiFlashBoard : public testing::Test {
     return {answer.begin() + first, answer.end()};
   }
   int status() { return read({0x05}, 1)[0]; }
-  void write(Bytes bytes, double seconds = 0.1) {
+  void write(const Bytes& bytes, double seconds = 0.1) {
     transfer({0x06});
     transfer(bytes);
     jtag_.wait(seconds);
@@ -221,7 +221,7 @@ TEST_F(SpiFlashBoard, AScanInPiecesIsOneTransaction) {
 }
 
 TEST_F(SpiFlashBoard, ProgramsAndReadsBackWhatWasWritten) {
-  constexpr std::size_t size = 256 * 1024;
+  constexpr std::size_t size = std::size_t{256} * 1024;
   const Bytes content = randomBits(size * 8, 3).bytes();
   for (std::size_t place = 0; place < size; place += 256) {
     Bytes page = {0x02, static_cast<std::uint8_t>(place >> 16), static_cast<std::uint8_t>(place >> 8), 0};

@@ -1,5 +1,3 @@
-#include "manager/simulator/StateFile.h"
-
 #include <gtest/gtest.h>
 #include <unistd.h>
 
@@ -7,6 +5,7 @@
 
 #include "manager/content/Bitstream.h"
 #include "manager/simulator/BoardLock.h"
+#include "manager/simulator/StateFile.h"
 #include "tests/unit/manager/simulator/Jtag.h"
 #include "tests/unit/support/Files.h"
 #include "tests/unit/support/ScopedVariable.h"
@@ -70,7 +69,7 @@ TEST_F(StateFileTest, KeepsMemoriesBetweenRuns) {
   TestBoard test(board, directory_.path());
   ASSERT_NE(test.board, nullptr) << test.failure;
   Jtag jtag(*test.board, findParts(test.parts, {"zp18v01", "marlin3-1"}));
-  EXPECT_EQ(BitVector::fromBytes(test.board->memory(0)).slice(9 * 2048, 2048), page);
+  EXPECT_EQ(BitVector::fromBytes(test.board->memory(0)).slice(std::size_t{9} * 2048, 2048), page);
   EXPECT_EQ(test.board->memory(1), bitstream);
   EXPECT_EQ(jtag.access(0, "ISC_STATUS", 0, 8), 32U) << "write-protected";
   EXPECT_EQ(jtag.access(1, "ISC_STATUS", 0, 8), 2U) << "running";
@@ -109,8 +108,9 @@ TEST_F(StateFileTest, EveryDamagedByteIsAFailure) {
 }
 
 TEST_F(StateFileTest, ForeignFilesAreNamedAsSuch) {
-  EXPECT_EQ(failureOf("hello"), path() + ": not a state file of a simulated board; delete it to begin with the "
-                                         "board's initial content");
+  EXPECT_EQ(failureOf("hello"), path() +
+                                    ": not a state file of a simulated board; delete it to begin with the "
+                                    "board's initial content");
   std::string whole = makeState();
   whole[8] = 9;
   EXPECT_NE(failureOf(whole).find("a state file of version 9, expected version 1"), std::string::npos);

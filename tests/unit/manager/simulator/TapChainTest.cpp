@@ -1,11 +1,10 @@
-#include "manager/simulator/TapChain.h"
-
 #include <gtest/gtest.h>
 
 #include <deque>
 #include <random>
 
 #include "manager/simulator/BoardClock.h"
+#include "manager/simulator/TapChain.h"
 
 namespace {
 
@@ -36,9 +35,7 @@ class SlowDevice {
  public:
   explicit SlowDevice(PartPointer part) : part_(std::move(part)), kept_(100, false) { reset(); }
 
-  void reset() {
-    instruction_ = part_->idcodes.empty() ? "BYPASS" : "IDCODE";
-  }
+  void reset() { instruction_ = part_->idcodes.empty() ? "BYPASS" : "IDCODE"; }
   bool tdo(TapState state) const {
     if (state == TapState::irShift) return ir_.front();
     return reg().front();
