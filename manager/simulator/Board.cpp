@@ -93,13 +93,6 @@ std::uint64_t Board::linkBytesLeft() const {
 }
 
 Status Board::loadState() {
-  Status status = readState();
-  // What could not be read must not be replaced either.
-  if (!status) statePath_.clear();
-  return status;
-}
-
-Status Board::readState() {
   std::error_code problem;
   if (statePath_.empty() || !std::filesystem::exists(statePath_, problem)) return {};
   Result<std::string> text = FileAccess::read(statePath_, StateFile::mostBytes);

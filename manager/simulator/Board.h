@@ -48,7 +48,6 @@ class Board : public SimulatedBoard {
   bool clockOnce(bool tms, bool tdi);
   /// What the faults make of levels of TDO.
   void disturb(BitVector& levels, std::size_t first);
-  Status readState();
   std::string stateText();
 
   std::string name_;

@@ -35,6 +35,9 @@ INSTANTIATE_TEST_SUITE_P(
         Bad{R"({"chain": [{"part": 3}]})", "board.json: chain[0].part: expected a text, found number"},
         Bad{R"({"chain": [], "colour": 1})",
             "board.json: colour: unknown key; known here are chain, faults, name, nets, state, tck"},
+        Bad{R"({"chain": [{"part": "zp18v01", "size": 1}]})",
+            "board.json: chain[0].size: unknown key; known here are bpi, bsdl, dna, faults, memory, model, monitors, "
+            "part, registers, spi, usercode"},
         Bad{R"({"chain": [], "tck": 0})", "board.json: tck: expected a number from 1 to 1000000000, found 0"},
         Bad{R"({"chain": [], "tck": "fast"})", "board.json: tck: expected a number, found string"},
         Bad{R"({"chain": [], "faults": {"stuckTdo": 2}})",

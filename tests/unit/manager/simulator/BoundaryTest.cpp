@@ -65,6 +65,14 @@ TEST_F(BoundaryRegister, AnOutputThatIsOffDrivesNothing) {
   EXPECT_TRUE(jtag_.data(0, driving(0, true)).get(2));
 }
 
+TEST_F(BoundaryRegister, AnotherInstructionLetsThePinsGo) {
+  jtag_.load(0, "EXTEST");
+  jtag_.data(0, driving(2, false));
+  jtag_.load(1, "EXTEST");
+  jtag_.data(1, driving(2, true));
+  EXPECT_TRUE(jtag_.data(1, driving(2, true)).get(8)) << "the first device would hold it low";
+}
+
 TEST_F(BoundaryRegister, ClampHoldsWhatWasPreloaded) {
   jtag_.load(1, "PRELOAD");
   jtag_.data(1, driving(2, true));

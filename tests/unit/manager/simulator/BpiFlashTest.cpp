@@ -137,6 +137,17 @@ TEST_F(Amd, WritesItsBufferWithinOnePage) {
   for (std::uint16_t i = 0; i < 4; ++i) EXPECT_EQ(word(sector + i), 0x1000 + i);
 }
 
+TEST_F(Amd, ABufferForAnotherSectorIsAborted) {
+  write(0x555, 0xAA);
+  write(0x2AA, 0x55);
+  write(0, 0x25);
+  write(0, 0);
+  write(sectorWords(), 0x1234);
+  write(0, 0x29);
+  jtag_.wait(0.01);
+  EXPECT_EQ(word(sectorWords()), 0xFFFF);
+}
+
 TEST_F(Amd, StreamsWordsFromAnAddressOn) {
   for (std::uint32_t i = 0; i < 3; ++i) {
     command(0xA0);
@@ -179,6 +190,16 @@ TEST_F(Intel, ProgramsAndErasesWithAStatusRegister) {
   EXPECT_EQ(read(0), 0xB0) << "a sequence that is wrong";
   write(0, 0x50);
   EXPECT_EQ(read(0), 0x80);
+}
+
+TEST_F(Intel, WhileBusyItTakesNoCommands) {
+  write(0, 0x40);
+  write(0, 0x1234);
+  write(1, 0x40);
+  write(1, 0x5678);
+  jtag_.wait(0.01);
+  EXPECT_EQ(word(0), 0x1234);
+  EXPECT_EQ(word(1), 0xFFFF);
 }
 
 TEST_F(Intel, ALockedSectorRefuses) {

@@ -137,6 +137,15 @@ TEST_F(StateFileTest, SectionsWithSizesBeyondTheFileAreRefused) {
   EXPECT_NE(failureOf(text).find("section x reaches beyond its end"), std::string::npos);
 }
 
+TEST_F(StateFileTest, BytesBehindTheLastSectionAreRefused) {
+  std::string text = makeState();
+  text.resize(text.size() - 4);
+  text += "more";
+  const std::uint32_t sum = Bitstream::crc32(std::vector<std::uint8_t>(text.begin(), text.end()));
+  for (int i = 0; i < 4; ++i) text += static_cast<char>(sum >> 8 * i & 0xFFU);
+  EXPECT_NE(failureOf(text).find("bytes behind its last section"), std::string::npos);
+}
+
 TEST_F(StateFileTest, TheLockIsThatOfTheStateFileHoweverItIsNamed) {
   const testsupport::ScopedVariable runtime("XDG_RUNTIME_DIR", directory_.path().c_str());
   const TestBoard test(board, directory_.path() + "/.");
