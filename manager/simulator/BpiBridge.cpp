@@ -49,7 +49,6 @@ bool BpiBridge::next() const { return streaming_ ? (word_ & 1U) != 0 : register_
 
 void BpiBridge::update() {
   if (!streaming_) register_.update();
-  streaming_ = false;
 }
 
 void BpiBridge::cycle(std::uint64_t bits) {

@@ -23,7 +23,7 @@ start_server
 session 'setMode -bscan' "setCable -port usb1 -server $server" 'identify' 'info' 'quit'
 check 'a session over the network succeeds' exited 0
 check 'without an error' is_empty err
-check 'and finds the board' holds out "'1': Added device marlin3-4, IDCODE 0x03004CFD, IR length 8"
+check 'and finds the board' holds out "'1': Added device marlin3-4, IDCODE 0x03004FFD, IR length 8"
 check 'and says which cable it has' holds out "Cable: server $server, locked"
 
 TESSEL_SERVER=$server session 'setMode -bscan' 'setCable -port auto' 'checkIntegrity' 'quit'

@@ -65,10 +65,10 @@ judge() {
     -c "gdb_port disabled; tcl_port disabled; telnet_port disabled" \
     -c "adapter driver remote_bitbang; remote_bitbang host 127.0.0.1; remote_bitbang port $port" \
     -c "adapter speed 1000" \
-    -c "jtag newtap own tap -irlen $last_length $mask -expected-id 0x00008cfd -ignore-version" \
-    -c "jtag newtap cpld tap -irlen 8 $mask -expected-id 0x06020cfd -ignore-version" \
-    -c "jtag newtap prom tap -irlen 8 $mask -expected-id 0x05101cfd -ignore-version" \
-    -c "jtag newtap fpga tap -irlen 8 $mask -expected-id 0x03001cfd -ignore-version" \
+    -c "jtag newtap own tap -irlen $last_length $mask -expected-id 0x00008ffd -ignore-version" \
+    -c "jtag newtap cpld tap -irlen 8 $mask -expected-id 0x06020ffd -ignore-version" \
+    -c "jtag newtap prom tap -irlen 8 $mask -expected-id 0x05101ffd -ignore-version" \
+    -c "jtag newtap fpga tap -irlen 8 $mask -expected-id 0x03001ffd -ignore-version" \
     "$@" >openocd.txt 2>&1
 }
 
@@ -92,14 +92,14 @@ while read -r line; do
   grep -qF -- "$line" openocd.txt || fail "OpenOCD does not say: $line"
   echo "ok: $line"
 done <<'LINES'
-JTAG tap: fpga.tap tap/device found: 0x03001cfd
-JTAG tap: prom.tap tap/device found: 0x05101cfd
-JTAG tap: cpld.tap tap/device found: 0x06020cfd
-JTAG tap: own.tap tap/device found: 0x00008cfd
+JTAG tap: fpga.tap tap/device found: 0x03001ffd
+JTAG tap: prom.tap tap/device found: 0x05101ffd
+JTAG tap: cpld.tap tap/device found: 0x06020ffd
+JTAG tap: own.tap tap/device found: 0x00008ffd
 prom usercode = cafe0001
 cpld usercode = 12345678
 fpga usercode = ffffffff
-own idcode = 00008cfd
+own idcode = 00008ffd
 prom status = 00
 prom enabled status = 08
 LINES

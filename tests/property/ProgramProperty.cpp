@@ -60,7 +60,7 @@ class Directory {
   }
 
   void writePart(std::size_t number) {
-    std::string idcode = "XXXX0001001000110100110011111101";
+    std::string idcode = "XXXX0001001000110100111111111101";
     for (std::size_t bit = 0; bit < 4; ++bit) idcode[8 + bit] = (number >> bit & 1) != 0 ? '1' : '0';
     const std::string flows = parttext::flows(pages(number), pageBits(number));
     write(partName(number) + ".bsd", parttext::bsdl(partName(number), idcode, flows));

@@ -80,7 +80,7 @@ TEST_F(OperationCallsTest, AWrongPartStopsBeforeAnythingIsErased) {
   ASSERT_TRUE(manager().addDeviceByPart(1, "zp20s16"));
   messages_.take();
   EXPECT_FALSE(perform({"program", "-p", "1", "-e", "-data", "FFFFFFFF"}));
-  EXPECT_THAT(errors(), ElementsAre("'2': IDCODE is 0x05208CFD, which is not that of zp20s16.\n"));
+  EXPECT_THAT(errors(), ElementsAre("'2': IDCODE is 0x05208FFD, which is not that of zp20s16.\n"));
   identify();
   EXPECT_TRUE(perform({"verify", "-p", "1", "-data", "00112233"}));
 }
@@ -112,7 +112,7 @@ TEST_F(OperationCallsTest, PositionsOutsideTheChainTouchNothing) {
 TEST_F(OperationCallsTest, WithTargetTheLastPositionCounts) {
   identify();
   EXPECT_TRUE(perform({"readidcode", "-target", "-p", "0", "-p", "2"}));
-  EXPECT_THAT(messages_.all(), Contains(status("'3': IDCODE is 0x06020CFD\n")));
+  EXPECT_THAT(messages_.all(), Contains(status("'3': IDCODE is 0x06020FFD\n")));
 }
 
 TEST_F(OperationCallsTest, AnUnknownDeviceCanBeDefinedAndPassedBy) {

@@ -269,7 +269,7 @@ TEST_F(IscMemories, AnotherIdcodeIsAFailure) {
   minnow(R"(, "faults": {"idcode": "12345679"})");
   const auto memory = bench.memory(makeIscMemory(*bench.chain, 0, bench.part("minnow8.bsd")));
   EXPECT_EQ(failureText(memory->open()),
-            "the IDCODE is 12345679, expected that of minnow8, XXXX0001001000110100110011111101");
+            "the IDCODE is 12345679, expected that of minnow8, XXXX0001001000110100111111111101");
 }
 
 TEST_F(IscMemories, AStuckLineIsABrokenChain) {

@@ -82,6 +82,6 @@ inline std::string bsdl(std::string_view name, std::string_view idcode, std::str
   return text + "end " + std::string(name) + ";\n";
 }
 
-inline const std::string_view idcode = "XXXX0001001000110100110011111101";
+inline const std::string_view idcode = "XXXX0001001000110100111111111101";
 
 }  // namespace parttext

@@ -54,7 +54,7 @@ TEST(BsdlFileTest, readsAPartOfEightPages) {
   EXPECT_EQ(part.opcodes.size(), 13U);
   EXPECT_EQ(opcodes(part, "ISC_ERASE"), "11101101 ");
   ASSERT_EQ(part.idcodes.size(), 1U);
-  EXPECT_EQ(pattern(part.idcodes[0]), "XXXX1000000000000001110011111101");
+  EXPECT_EQ(pattern(part.idcodes[0]), "XXXX1000000000000001111111111101");
   EXPECT_FALSE(part.usercode.has_value());
   EXPECT_DOUBLE_EQ(part.maxTck, 10e6);
   EXPECT_EQ(cell(part, 0), "BC_1 Q output2 X");

@@ -12,11 +12,11 @@ using testing::IsEmpty;
 std::string smallFile(const std::string& entity, const std::string& partNumber) {
   return "entity " + entity + " is\nattribute INSTRUCTION_LENGTH of " + entity +
          " : entity is 5;\nattribute IDCODE_REGISTER of " + entity + " : entity is \"XXXX" + partNumber +
-         "110011111101\";\nend " + entity + ";\n";
+         "111111111101\";\nend " + entity + ";\n";
 }
 
 /// The IDCODE of a part with this part number, version 7.
-BitVector idcode(std::uint32_t partNumber) { return BitVector::fromNumber(0x70000CFDU | partNumber << 12U, 32); }
+BitVector idcode(std::uint32_t partNumber) { return BitVector::fromNumber(0x70000FFDU | partNumber << 12U, 32); }
 
 std::string nameOf(const PartPointer& part) { return part ? part->name : "none"; }
 

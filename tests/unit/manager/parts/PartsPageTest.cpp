@@ -34,7 +34,7 @@ TEST(PartsPageTest, thePartOfOnesOwnCanBeUsed) {
   EXPECT_EQ((*part)->memoryBits, 512U);
   EXPECT_EQ((*part)->isc.actions.size(), 4U);
   EXPECT_EQ((*part)->registers.size(), 2U);
-  EXPECT_EQ(library.identify(BitVector::fromNumber(0x38001CFD, 32)), *part);
+  EXPECT_EQ(library.identify(BitVector::fromNumber(0x38001FFD, 32)), *part);
 }
 
 TEST(PartsPageTest, theJsonFileWithAllKeysIsValid) {
