@@ -93,7 +93,7 @@ bool goRound(int socket) {
 
 bool reportRoundTrip() {
   PartLibrary parts;
-  const auto board = SimulatedBoard::makeDefault(parts);
+  const auto board = SimulatedBoard::makeDefault();
   BoardServer server(*board);
   if (!server.listen("127.0.0.1", "0")) return false;
   std::thread serving([&server] { static_cast<void>(server.run(true)); });

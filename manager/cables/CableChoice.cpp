@@ -9,6 +9,7 @@
 #include "interfaces/portability/UT_STR.h"
 #include "manager/cables/RemoteCable.h"
 #include "manager/cables/SimulatedCable.h"
+#include "manager/cables/Socket.h"
 
 namespace {
 
@@ -42,7 +43,10 @@ Result<CableChoice> CableChoice::find(const char* type, const char* server, cons
   if (named != nullptr) {
     choice.kind = Kind::server;
     choice.server = named;
-    choice.sharedName = "server " + choice.server;
+    const Result<ServerAddress> address = ServerAddress::parse(named, RemoteCable::defaultPort);
+    if (!address) return address.failure();
+    // One name for one server, however it is written.
+    choice.sharedName = "server " + Socket::resolved(*address);
     return choice;
   }
   if (type == nullptr) return Failure{Port::format("The port word names no cable. %s", choices)};
@@ -55,7 +59,7 @@ Result<CableChoice> CableChoice::find(const char* type, const char* server, cons
 
 Result<std::shared_ptr<SimulatedBoard>> CableOpener::read(const std::string& file) {
   if (board_ != nullptr && boardFile_ == file) return board_;
-  if (file.empty()) return std::shared_ptr<SimulatedBoard>(SimulatedBoard::makeDefault(parts_));
+  if (file.empty()) return std::shared_ptr<SimulatedBoard>(SimulatedBoard::makeDefault());
   Result<std::unique_ptr<SimulatedBoard>> board = SimulatedBoard::read(file, parts_);
   if (!board) return board.failure();
   return std::shared_ptr<SimulatedBoard>(std::move(*board));

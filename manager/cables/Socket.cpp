@@ -10,6 +10,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <array>
 #include <cerrno>
 #include <charconv>
 #include <chrono>
@@ -210,4 +211,19 @@ Result<std::unique_ptr<ByteChannel>> Socket::connect(const ServerAddress& addres
 
 std::unique_ptr<ByteChannel> Socket::over(int descriptor) {
   return std::make_unique<SocketChannel>(Descriptor(descriptor));
+}
+
+std::string Socket::resolved(const ServerAddress& address) {
+  if (address.host.empty()) return address.text();
+  const Addresses addresses(address.host, address.port);
+  std::string first;
+  for (const addrinfo* each = addresses.first(); each != nullptr; each = each->ai_next) {
+    std::array<char, NI_MAXHOST> host{};
+    if (::getnameinfo(each->ai_addr, each->ai_addrlen, host.data(), host.size(), nullptr, 0, NI_NUMERICHOST) != 0)
+      continue;
+    const std::string name = host.data();
+    if (name == "::1" || name.starts_with("127.")) return "loopback:" + std::to_string(address.port);
+    if (first.empty()) first = name + ":" + std::to_string(address.port);
+  }
+  return first.empty() ? address.text() : first;
 }

@@ -24,6 +24,9 @@ namespace Socket {
 /// Tries the addresses of the host one after the other, for so many seconds in all. The look-up of the name has the
 /// system's own time limit.
 Result<std::unique_ptr<ByteChannel>> connect(const ServerAddress& address, double seconds);
+/// One text for one server, however its host is written: the first numeric address that the host has, this machine
+/// by one name. The text of the address itself when the host can't be looked up.
+std::string resolved(const ServerAddress& address);
 /// A channel over a connected socket, which it closes.
 std::unique_ptr<ByteChannel> over(int descriptor);
 

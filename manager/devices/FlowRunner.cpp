@@ -283,8 +283,9 @@ void FlowRunner::keepData(const Isc::Field& field, std::size_t place, const BitV
     // A difference stays one, whatever a later comparison of the same bits finds.
     outcome_.found.setNumber(at, count, (old & known) | (bits.number(done, count) & ~known));
     outcome_.differing.setNumber(at, count, known | now);
-    outcome_.seen.setNumber(at, count, outcome_.seen.number(at, count) | care);
   }
+  // Bits that the flow's own mask leaves out are no concern of the part's.
+  mark(outcome_.seen, place, field.length);
 }
 
 /// The bits that are compared when the cable does it.

@@ -63,7 +63,8 @@ bool DeviceManager::runOperation(Cable& cable, const UT_CMDARGS& args) {
                            .parts = parts(),
                            .mode = activeMode_,
                            .progressCallback = progress_,
-                           .multibootBpiWidth = multibootBpiWidth()};
+                           .multibootBpiWidth = multibootBpiWidth(),
+                           .attachedTarget = target_.attached && args.findsw("-target")};
   bool linkLost = false;
   const bool result = Operations::run(context, args, linkLost);
   // The next operation opens the cable again.

@@ -81,10 +81,10 @@ Status doPreload(DeviceWork& work) {
   const char* instruction = (*part)->opcode("PRELOAD") != nullptr ? "PRELOAD" : "SAMPLE";
   work.status("Preloading boundary register...");
   TESSEL_TRY(Registers::load(work.scan(), work.index(), **part, instruction));
-  BitVector pins;
-  TESSEL_TRY(work.scan().scanData(work.index(), {.out = *bits, .in = &pins}));
+  BitVector captured;
+  TESSEL_TRY(work.scan().scanData(work.index(), {.out = *bits, .in = &captured}));
   work.status("Preloaded %d bits", bits->size());
-  work.status("Pins are 0x%s", pins.hex());
+  work.status("Boundary register captured 0x%s", captured.hex());
   return {};
 }
 
@@ -123,46 +123,65 @@ Result<BitVector> levelsOf(const UT_CMDARGS& args, const char* name, std::size_t
   return levels;
 }
 
-std::size_t countOf(const UT_CMDARGS& args) {
-  if (const UT_CMDSWINFO* clocks = args.getsw("-tck", 0))
-    return static_cast<std::size_t>(std::clamp(clocks->getargnum32(0), 0, 1 << 20));
+constexpr std::int32_t mostClocks = 1 << 20;
+
+/// A count behind a switch, from 1 to `mostClocks`; `otherwise` without the switch.
+Result<std::int32_t> countOf(const UT_CMDARGS& args, const char* name, std::int32_t otherwise) {
+  const UT_CMDSWINFO* given = args.getsw(name, 0);
+  if (given == nullptr) return otherwise;
+  const std::int32_t count = given->getargnum32(0);
+  if (count >= 1 && count <= mostClocks) return count;
+  return Failure{Port::format("%s %d is not what was expected: 1 to %d.", name, count, mostClocks)};
+}
+
+/// As many clocks as the longer one of the switches has levels.
+std::int32_t levelsGiven(const UT_CMDARGS& args) {
   std::size_t most = 0;
   for (const char* name : {"-tms", "-tdi"})
     if (const UT_CMDSWINFO* given = args.getsw(name, 0))
       most = std::max(most, std::string_view(given->getargtxt(0)).size());
-  return most;
+  return static_cast<std::int32_t>(most);
+}
+
+Status resetTaps(OperationContext& context) {
+  TESSEL_TRY(context.cable.goTo(TapState::reset));
+  reportStatus("TAPs are in Test-Logic-Reset\n");
+  return {};
+}
+
+Status clockByHand(OperationContext& context, const UT_CMDARGS& args, std::size_t count, std::int32_t times) {
+  const Result<BitVector> tms = levelsOf(args, "-tms", count);
+  if (!tms) return tms.failure();
+  const Result<BitVector> tdi = levelsOf(args, "-tdi", count);
+  if (!tdi) return tdi.failure();
+  for (std::int32_t i = 0; i < times; ++i) {
+    BitVector tdo;
+    TESSEL_TRY(context.cable.clock(*tms, *tdi, &tdo));
+    std::string levels = tdo.binary();
+    std::ranges::reverse(levels);
+    reportStatus("TDO is %s\n", levels);
+  }
+  return {};
 }
 
 Status bsdebug(OperationContext& context, const UT_CMDARGS& args) {
-  if (args.findsw("-start") || args.findsw("-reset")) {
-    TESSEL_TRY(context.cable.goTo(TapState::reset));
-    reportStatus("TAPs are in Test-Logic-Reset\n");
-  }
-  const std::size_t count = countOf(args);
-  if (count > 0) {
-    const Result<BitVector> tms = levelsOf(args, "-tms", count);
-    if (!tms) return tms.failure();
-    const Result<BitVector> tdi = levelsOf(args, "-tdi", count);
-    if (!tdi) return tdi.failure();
-    const UT_CMDSWINFO* loop = args.getsw("-loop", 0);
-    const int times = loop == nullptr ? 1 : std::clamp(loop->getargnum32(0), 0, 1 << 16);
-    for (int i = 0; i < times; ++i) {
-      BitVector tdo;
-      TESSEL_TRY(context.cable.clock(*tms, *tdi, &tdo));
-      std::string levels = tdo.binary();
-      std::ranges::reverse(levels);
-      reportStatus("TDO is %s\n", levels);
-    }
-  }
-  if (args.findsw("-stop")) {
-    TESSEL_TRY(context.cable.goTo(TapState::reset));
-    reportStatus("TAPs are in Test-Logic-Reset\n");
-  }
+  const Result<std::int32_t> count = countOf(args, "-tck", levelsGiven(args));
+  if (!count) return count.failure();
+  const Result<std::int32_t> times = countOf(args, "-loop", 1);
+  if (!times) return times.failure();
+  const bool before = args.findsw("-start") || args.findsw("-reset");
+  const bool after = args.findsw("-stop");
+  if (*count == 0 && !before && !after) return Failure{"bsdebug needs -start, -reset, -stop, -tms, -tdi or -tck."};
+  if (std::int64_t{*count} * *times > mostClocks)
+    return Failure{Port::format("bsdebug clocks at most %d times, not %d times %d.", mostClocks, *times, *count)};
+  if (before) TESSEL_TRY(resetTaps(context));
+  if (*count > 0) TESSEL_TRY(clockByHand(context, args, static_cast<std::size_t>(*count), *times));
+  if (after) TESSEL_TRY(resetTaps(context));
   return context.cable.flush();
 }
 
 constexpr OperationRow rows[] = {
-    {"bypass", bypass, false},
+    {"bypass", bypass},
     {"highz", highz},
     {"clamp", clamp},
     {"doPreload", doPreload},

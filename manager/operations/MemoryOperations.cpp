@@ -42,8 +42,15 @@ Status programWith(DeviceWork& work, bool onlyFpga) {
                                        .verify = work.has("-v"),
                                        .onlyFpga = onlyFpga || work.has("-onlyFpga"),
                                        .key = {}};
+  const Result<std::optional<MemoryWork::Region>> region = MemoryWork::revision(work, **memory);
+  if (!region) return region.failure();
   work.status("Programming %s with %s...", (*memory)->name(), source->name);
-  TESSEL_TRY((*memory)->program(source->image, options, work.progress()));
+  // Erasing takes all revisions: the others are written again.
+  const bool keepsOthers = region->has_value() && options.erase;
+  const Result<DataImage> image =
+      keepsOthers ? MemoryWork::withOthers(work, **memory, **region, &source->image) : source->image;
+  if (!image) return image.failure();
+  TESSEL_TRY((*memory)->program(*image, options, work.progress()));
   work.status("Programmed %d bytes", bytesOf(source->image));
   if (options.verify) work.status("Verified %d bytes", bytesOf(source->image));
   for (const RegisterWork::Write& write : *codes) TESSEL_TRY(RegisterWork::write(work, write));
@@ -76,9 +83,22 @@ Status verify(DeviceWork& work) {
   return {};
 }
 
+/// Erasing takes all revisions: the others are written again.
+Status eraseRevision(DeviceWork& work, Memory& memory, const MemoryWork::Region& region) {
+  work.status("Erasing a revision of %s...", memory.name());
+  const Result<DataImage> others = MemoryWork::withOthers(work, memory, region, nullptr);
+  if (!others) return others.failure();
+  TESSEL_TRY(memory.program(*others, {.erase = true, .verify = true, .onlyFpga = false, .key = {}}, work.progress()));
+  work.status("Erased %d bytes of %s", region.size, memory.name());
+  return {};
+}
+
 Status erase(DeviceWork& work) {
   Result<std::unique_ptr<Memory>> memory = MemoryWork::memory(work);
   if (!memory) return memory.failure();
+  const Result<std::optional<MemoryWork::Region>> revision = MemoryWork::revision(work, **memory);
+  if (!revision) return revision.failure();
+  if (*revision) return eraseRevision(work, **memory, **revision);
   std::optional<MemoryWork::Source> region;
   if (work.has("-file")) {
     Result<MemoryWork::Source> source = MemoryWork::source(work, **memory);
@@ -92,11 +112,20 @@ Status erase(DeviceWork& work) {
   return {};
 }
 
+Result<Comparison> blankCheckOf(DeviceWork& work, Memory& memory, const MemoryWork::Region& region) {
+  DataImage blank;
+  blank.add(region.first, std::vector<std::uint8_t>(region.size, 0xFF));
+  return memory.compare(blank, work.progress());
+}
+
 Status blankCheck(DeviceWork& work) {
   Result<std::unique_ptr<Memory>> memory = MemoryWork::memory(work);
   if (!memory) return memory.failure();
+  const Result<std::optional<MemoryWork::Region>> revision = MemoryWork::revision(work, **memory);
+  if (!revision) return revision.failure();
   work.status("Blank check of %s...", (*memory)->name());
-  const Result<Comparison> result = (*memory)->blankCheck(work.progress());
+  const Result<Comparison> result =
+      *revision ? blankCheckOf(work, **memory, **revision) : (*memory)->blankCheck(work.progress());
   if (!result) return result.failure();
   if (!result->equal())
     return Failure{Port::format("%s is not blank: %s.", (*memory)->name(), MemoryWork::shown(*result)),
@@ -108,8 +137,11 @@ Status blankCheck(DeviceWork& work) {
 Status checksum(DeviceWork& work) {
   Result<std::unique_ptr<Memory>> memory = MemoryWork::memory(work);
   if (!memory) return memory.failure();
+  const Result<std::optional<MemoryWork::Region>> revision = MemoryWork::revision(work, **memory);
+  if (!revision) return revision.failure();
+  const MemoryWork::Region region = revision->value_or(MemoryWork::Region{0, (*memory)->size()});
   work.status("Calculating checksum of %s...", (*memory)->name());
-  const auto bytes = (*memory)->read(0, (*memory)->size(), work.progress());
+  const auto bytes = (*memory)->read(region.first, region.size, work.progress());
   if (!bytes) return bytes.failure();
   work.status("Checksum is 0x%08X", std::accumulate(bytes->begin(), bytes->end(), std::uint32_t{0}));
   return {};
@@ -137,6 +169,9 @@ Result<DataFile::Format> outputFormat(DeviceWork& work, const std::string& file)
 Status readback(DeviceWork& work) {
   const char* file = work.text("-file");
   if (file == nullptr) return Failure{"readbacktofile needs -file."};
+  if (const UT_CMDSWINFO* positions = work.args().getsw("-p", 0);
+      positions != nullptr && positions->getnumargs() > 1 && !work.has("-target"))
+    return Failure{"readbacktofile writes one file, so it takes one position."};
   const Result<DataFile::Format> format = outputFormat(work, file);
   if (!format) return format.failure();
   Result<std::unique_ptr<Memory>> memory = MemoryWork::memory(work);

@@ -1,6 +1,7 @@
 #pragma once
 
 #include <memory>
+#include <optional>
 #include <string>
 
 #include "manager/content/DataImage.h"
@@ -20,6 +21,17 @@ struct Source {
 /// The data that a command means: `-data`, the file of `-file`, or the assigned one; moved to the place of the
 /// revision when the command names one of `memory`'s.
 Result<Source> source(DeviceWork& work, const Memory& memory);
+
+/// A part of a memory, in bytes.
+struct Region {
+  std::uint64_t first = 0;
+  std::uint64_t size = 0;
+};
+/// The place of the revision that a command names; revisions share the memory evenly. Empty when it names none.
+Result<std::optional<Region>> revision(DeviceWork& work, const Memory& memory);
+/// The whole content that a memory is to have when one region changes and the others stay: the region is blank but
+/// for the data.
+Result<DataImage> withOthers(DeviceWork& work, Memory& memory, const Region& region, const DataImage* data);
 
 /// "12 of 4096 bytes differ, the first at address 0x00000010: expected 0x12, found 0x34".
 std::string shown(const Comparison& comparison);

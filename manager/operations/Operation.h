@@ -24,6 +24,7 @@ struct OperationContext {
   tESSELNS::MODE_TYPE mode = tESSELNS::BOUNDARY_SCAN;
   bool (*progressCallback)(Callback&) = nullptr;
   int multibootBpiWidth = 16;
+  bool attachedTarget = false;  ///< the flash attached to the target is meant
 };
 
 /// One operation on one device.
@@ -44,7 +45,8 @@ class DeviceWork {
   Result<PartPointer> part();
   bool has(const char* name) const { return args_.findsw(name); }
   /// The flash behind the device is meant, because the command or the mode says so.
-  bool spiOnly() const { return spiOnly_ || has("-spionly"); }
+  bool spiOnly() { return spiOnly_ || has("-spionly") || (context_.attachedTarget && device().spiFlash.has_value()); }
+  bool bpiOnly() { return has("-bpionly") || (context_.attachedTarget && !device().spiFlash.has_value()); }
   /// For the mode of SPI flash; messages name the flash's position.
   void setSpiOnly(int shownPosition) {
     spiOnly_ = true;
@@ -74,7 +76,7 @@ class DeviceWork {
 struct OperationRow {
   const char* word;
   Status (*device)(DeviceWork& work);
-  bool checksChain = true;  ///< the chain must be as described before the handler runs
+  bool checksChain = true;  ///< the chain must be as described before the handler runs, with all IR lengths known
   Status (*chain)(OperationContext& context, const UT_CMDARGS& args) = nullptr;
   std::size_t shortest = 0;  ///< the length of the word's shortest abbreviation; 0 for none
 };

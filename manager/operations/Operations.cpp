@@ -72,7 +72,9 @@ bool runOnDevices(OperationContext& context, const UT_CMDARGS& args, const Opera
   if (positions.empty()) return false;
   if (context.mode == tESSELNS::SPI)
     return forEach(positions, linkLost, [&](int position) { return SpiMode::run(context, args, row, position); });
-  const Result<std::vector<std::size_t>> lengths = context.chain.irLengths();
+  const Result<std::vector<std::size_t>> lengths =
+      row.checksChain ? context.chain.irLengths()
+                      : std::vector<std::size_t>(static_cast<std::size_t>(context.chain.size()));
   if (!lengths) return reportError("%s\n", lengths.failure().text);
   if (row.checksChain)
     if (const Status chain = Operations::checkChain(context); !chain) {

@@ -104,15 +104,47 @@ Status writeRegister(DeviceWork& work) {
   return RegisterWork::write(work, *write);
 }
 
-/// Blows the key. It is neither read back nor shown.
+/// Whether a bit of the eFuse control register, found by its name, is blown; false for a part without it.
+Result<bool> isBlown(DeviceWork& work, const Part& part, const char* fieldName) {
+  const NamedRegister* control = part.findRegister("efuse_control");
+  if (control == nullptr) return false;
+  const auto field = std::ranges::find(control->fields, fieldName, &RegisterField::name);
+  if (field == control->fields.end()) return false;
+  const Result<BitVector> value =
+      Registers::read(work.scan(), work.index(), part, control->instruction, control->length);
+  if (!value) return value.failure();
+  return value->get(field->first);
+}
+
+/// Blows the key and, as long as it can be read, sees that it is right. It is never shown.
 Status blowKey(DeviceWork& work, const Part& part, const char* key) {
   const NamedRegister* named = part.findRegister("efuse");
   if (named == nullptr || named->writeInstruction.empty())
     return Failure{Port::format("%s can't do programEFuse: it has no eFuse key.", part.name)};
   const Result<BitVector> bits = RegisterWork::bitsOfHex(key, named->length, "The key");
   if (!bits) return bits.failure();
+  const auto read = [&] { return Registers::read(work.scan(), work.index(), part, named->instruction, named->length); };
+  const Result<bool> closed = isBlown(work, part, "key_write_disabled");
+  if (!closed) return closed.failure();
+  if (*closed) return Failure{Port::format("The eFuse key of %s can't be blown any more.", part.name)};
+  const Result<bool> hidden = isBlown(work, part, "key_read_disabled");
+  if (!hidden) return hidden.failure();
+  const bool reads = !*hidden && !work.cable().recordsOnly();
+  if (reads) {
+    const Result<BitVector> before = read();
+    if (!before) return before.failure();
+    // What is blown and is no part of the key.
+    const BitVector others = ~*bits;
+    if (firstDifference(*before, BitVector(named->length), &others) != BitVector::npos)
+      return Failure{Port::format("Another eFuse key has been blown into %s already.", part.name)};
+  }
   work.status("Programming eFuse key...");
   TESSEL_TRY(Registers::write(work.scan(), work.index(), part, named->writeInstruction, *bits));
+  if (reads) {
+    const Result<BitVector> after = read();
+    if (!after) return after.failure();
+    if (*after != *bits) return Failure{"The eFuse key that was blown reads back wrong.", Failure::Kind::mismatch};
+  }
   work.status("Programmed eFuse key");
   return {};
 }

@@ -69,17 +69,25 @@ Status RegisterWork::write(DeviceWork& work, const Write& write) {
   const Result<PartPointer> part = work.part();
   if (!part) return part.failure();
   const Row& row = *write.row;
+  const NamedRegister& reg = *write.reg;
+  const bool reads = !work.cable().recordsOnly() && !reg.instruction.empty();
+  const auto read = [&] { return Registers::read(work.scan(), work.index(), **part, reg.instruction, reg.length); };
   work.status("Programming %s...", row.title);
-  TESSEL_TRY(Registers::write(work.scan(), work.index(), **part, write.reg->writeInstruction, write.bits));
-  if (!work.cable().recordsOnly() && !write.reg->instruction.empty()) {
-    const Result<BitVector> found =
-        Registers::read(work.scan(), work.index(), **part, write.reg->instruction, write.reg->length);
-    if (!found) return found.failure();
-    if (firstDifference(*found, write.bits, row.onlyBlows ? &write.bits : nullptr) != BitVector::npos)
-      return Failure{Port::format("The %s is 0x%s after it was written, expected 0x%s.", row.title, found->hex(),
-                                  write.bits.hex()),
-                     Failure::Kind::mismatch};
+  BitVector expected = write.bits;
+  if (reads && row.onlyBlows) {
+    const Result<BitVector> before = read();
+    if (!before) return before.failure();
+    for (std::size_t i = 0; i < expected.size(); ++i) expected.set(i, expected.get(i) || before->get(i));
   }
-  work.status("Programmed %s 0x%s", row.title, write.bits.hex());
+  TESSEL_TRY(Registers::write(work.scan(), work.index(), **part, reg.writeInstruction, write.bits));
+  if (reads) {
+    const Result<BitVector> found = read();
+    if (!found) return found.failure();
+    if (*found != expected)
+      return Failure{
+          Port::format("The %s is 0x%s after it was written, expected 0x%s.", row.title, found->hex(), expected.hex()),
+          Failure::Kind::mismatch};
+  }
+  work.status("Programmed %s 0x%s", row.title, expected.hex());
   return {};
 }

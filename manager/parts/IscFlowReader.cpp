@@ -152,8 +152,10 @@ void FlowReader::readWait(Isc::Step& step) {
   if (!cursor_.accept(":")) return;
   const Token place = cursor_.peek();
   step.most = readLimit();
-  if (step.most->cycles < step.least.cycles || step.most->seconds < step.least.seconds)
-    cursor_.fail(place, "the longest wait is shorter than the shortest");
+  // Cycles and seconds can't be compared with each other.
+  const bool fewer = step.most->cycles != 0 && step.most->cycles < step.least.cycles;
+  const bool shorter = step.most->seconds != 0 && step.most->seconds < step.least.seconds;
+  if (fewer || shorter) cursor_.fail(place, "the longest wait is shorter than the shortest");
 }
 
 /// A capture begins with a number as well: its length, which is followed by ':'. That is no limit, unless it has a

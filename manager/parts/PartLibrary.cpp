@@ -90,11 +90,14 @@ Status PartLibrary::scanDirectory(const std::string& directory) {
 
 /// The failure is that of the first directory that can't be read; the others are searched nevertheless.
 Status PartLibrary::scanDirectories() {
-  if (scanned_) return {};
+  if (scanned_) return scanResult_;
   scanned_ = true;
   for (const std::string& directory : directories_)
-    if (const Status status = scanDirectory(directory); !status) unreadable_.push_back(status.failure().text);
-  return unreadable_.empty() ? Status() : Status(Failure{.text = unreadable_.front()});
+    if (const Status status = scanDirectory(directory); !status) {
+      unreadable_.push_back(status.failure().text);
+      if (scanResult_) scanResult_ = status;
+    }
+  return scanResult_;
 }
 
 Result<PartPointer> PartLibrary::load(Entry& entry) {
@@ -122,11 +125,12 @@ Failure PartLibrary::unknown(std::string_view name) const {
 }
 
 Result<PartPointer> PartLibrary::find(std::string_view name) {
-  TESSEL_TRY(scanDirectories());
+  const Status scanned = scanDirectories();
   const std::string wanted = normalised(name);
   for (std::vector<Entry>* entries : {&users_, &builtIn_})
     for (Entry& entry : *entries)
       if (entry.name == wanted) return load(entry);
+  if (!scanned) return scanned.failure();
   return unknown(name);
 }
 

@@ -13,8 +13,8 @@
 /// they are wanted first and kept.
 class PartLibrary {
  public:
-  /// Directories with BSDL files (.bsd, .bsdl, .bsm), in the order of the search. One that can't be read is a
-  /// failure of the first search.
+  /// Directories with BSDL files (.bsd, .bsdl, .bsm), in the order of the search. One that can't be read is the
+  /// failure of a part that is not found elsewhere.
   explicit PartLibrary(std::vector<std::string> directories = {});
 
   /// By name, in any letter case; '-' and '_' are one. The failure lists what comes near.
@@ -44,6 +44,7 @@ class PartLibrary {
 
   std::vector<std::string> directories_;
   bool scanned_ = false;
+  Status scanResult_;                    ///< the failure of the first directory that could not be read
   std::vector<std::string> unreadable_;  ///< directories, for `identify`
   std::vector<Entry> users_;
   std::vector<Entry> builtIn_;

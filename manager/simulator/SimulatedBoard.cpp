@@ -40,7 +40,8 @@ Result<std::unique_ptr<SimulatedBoard>> SimulatedBoard::parse(std::string_view n
   return make(name, text, directory, "", parts);
 }
 
-std::unique_ptr<SimulatedBoard> SimulatedBoard::makeDefault(PartLibrary& parts) {
-  // Its parts are built in and its text is our own, so that it can't fail.
-  return std::move(*make("default", defaultBoard, "", "", parts));
+std::unique_ptr<SimulatedBoard> SimulatedBoard::makeDefault() {
+  // Its parts are built in, whatever parts the user has, and its text is our own, so that it can't fail.
+  PartLibrary builtIn;
+  return std::move(*make("default", defaultBoard, "", "", builtIn));
 }

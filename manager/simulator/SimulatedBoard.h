@@ -20,7 +20,7 @@ class SimulatedBoard {
   static Result<std::unique_ptr<SimulatedBoard>> parse(std::string_view name, std::string_view text,
                                                        const std::string& directory, PartLibrary& parts);
   /// The board that port null has until another one is chosen.
-  static std::unique_ptr<SimulatedBoard> makeDefault(PartLibrary& parts);
+  static std::unique_ptr<SimulatedBoard> makeDefault();
 
   virtual ~SimulatedBoard() = default;
 

@@ -65,7 +65,7 @@ int makeBitstream(const Options& options, PartLibrary& parts) {
 }
 
 Result<std::unique_ptr<SimulatedBoard>> readBoard(const Options& options, PartLibrary& parts) {
-  if (options.board.empty()) return SimulatedBoard::makeDefault(parts);
+  if (options.board.empty()) return SimulatedBoard::makeDefault();
   return SimulatedBoard::read(options.board, parts);
 }
 
@@ -73,6 +73,9 @@ int serve(const Options& options, PartLibrary& parts) {
   const std::size_t colon = options.listen.rfind(':');
   if (colon == std::string::npos || colon + 1 == options.listen.size())
     return misuse("--listen: expected HOST:PORT, found \"" + options.listen + "\"");
+  const std::string port = options.listen.substr(colon + 1);
+  if (port.size() > 5 || port.find_first_not_of("0123456789") != std::string::npos || std::stoi(port) > 65535)
+    return misuse("--listen: expected a port from 0 to 65535, found \"" + port + "\"");
   std::string host = options.listen.substr(0, colon);
   if (host.size() > 1 && host.front() == '[' && host.back() == ']') host = host.substr(1, host.size() - 2);
 
@@ -85,8 +88,7 @@ int serve(const Options& options, PartLibrary& parts) {
   if (!lockName.empty()) board = readBoard(options, parts);
   if (!board) return fail(board.failure().text);
   BoardServer boardServer(**board);
-  if (const Status listening = boardServer.listen(host, options.listen.substr(colon + 1)); !listening)
-    return fail(listening.failure().text);
+  if (const Status listening = boardServer.listen(host, port); !listening) return fail(listening.failure().text);
   server = &boardServer;
   std::signal(SIGINT, stopServer);
   std::signal(SIGTERM, stopServer);

@@ -223,6 +223,64 @@ TEST_F(OperationCallsTest, TheEFuseKeyIsUsedAndShownNowhere) {
   EXPECT_EQ(manager().getDeviceAttribute(0, DeviceNS::KEY), nullptr);
 }
 
+TEST_F(OperationCallsTest, AKeyThatCannotBeBlownIsRefused) {
+  identify();
+  EXPECT_TRUE(perform({"programEFuse", "-p", "0", "-key", "0F"}));
+  EXPECT_FALSE(perform({"programEFuse", "-p", "0", "-key", "F0"}));
+  EXPECT_TRUE(perform({"programEFuse", "-p", "0", "-control", "02"}));
+  EXPECT_FALSE(perform({"programEFuse", "-p", "0", "-key", "0F"}));
+  EXPECT_THAT(errors(), ElementsAre("'1': Another eFuse key has been blown into marlin3-4 already.\n",
+                                    "'1': The eFuse key of marlin3-4 can't be blown any more.\n"));
+}
+
+TEST_F(OperationCallsTest, FusesAddUp) {
+  identify();
+  EXPECT_TRUE(perform({"setEFuseControlReg", "-p", "0", "-data", "100"}));
+  EXPECT_TRUE(perform({"setEFuseControlReg", "-p", "0", "-data", "200"}));
+  EXPECT_THAT(messages_.all(), Contains(status("'1': Programmed eFuse control register 0x00000300\n")));
+}
+
+TEST_F(OperationCallsTest, WorkOnOneRevisionLeavesTheOthers) {
+  identify();
+  testsupport::writeFile("one.bin", "\x11\x22");
+  EXPECT_TRUE(perform({"program", "-p", "1", "-e", "-v", "-data", "1122"}));
+  EXPECT_TRUE(perform({"program", "-p", "1", "-revision", "1", "-e", "-v", "-data", "3344"}));
+  EXPECT_TRUE(perform({"verify", "-p", "1", "-file", "one.bin"}));
+  EXPECT_FALSE(perform({"blankCheck", "-p", "1", "-revision", "1"}));
+  EXPECT_TRUE(perform({"blankCheck", "-p", "1", "-revision", "2"}));
+  EXPECT_TRUE(perform({"erase", "-p", "1", "-revision", "1"}));
+  EXPECT_TRUE(perform({"blankCheck", "-p", "1", "-revision", "1"}));
+  EXPECT_TRUE(perform({"verify", "-p", "1", "-file", "one.bin"}));
+  EXPECT_FALSE(perform({"erase", "-p", "1", "-revision", "4"}));
+  EXPECT_EQ(errors().size(), 2U);
+}
+
+TEST_F(OperationCallsTest, AnAttachedTargetIsTheFlashAndNeverTheDevice) {
+  identify();
+  manager().setTargetDevice(tESSELNS::BOUNDARY_SCAN, 0, true);
+  EXPECT_FALSE(perform({"erase", "-target", "-p", "0"}));
+  EXPECT_THAT(errors(), ElementsAre("'1': No BPI flash is attached to marlin3-4. Use attachFlash.\n"));
+  ASSERT_TRUE(manager().attachDeviceByPart(0, tESSELNS::SPI_FLASH, "w25q64"));
+  EXPECT_TRUE(perform({"program", "-target", "-e", "-data", "42", "-p", "0"}));
+  EXPECT_THAT(messages_.all(), Contains(status("'1': Programming SPI flash w25q64 with the data of -data...\n")));
+}
+
+TEST_F(OperationCallsTest, ByHandTheTapIsClockedWithinLimits) {
+  EXPECT_TRUE(perform({"bsdebug", "-reset", "-tms", "0", "-tck", "8", "-loop", "2"}));
+  EXPECT_FALSE(perform({"bsdebug"}));
+  EXPECT_FALSE(perform({"bsdebug", "-tms", "0", "-tck", "-5"}));
+  EXPECT_FALSE(perform({"bsdebug", "-tms", "0", "-tck", "1000000", "-loop", "1000000"}));
+  EXPECT_FALSE(perform({"bsdebug", "-tms", "2"}));
+  EXPECT_EQ(errors().size(), 4U);
+}
+
+TEST_F(OperationCallsTest, OneFileIsReadFromOneDevice) {
+  identify();
+  EXPECT_FALSE(perform({"readbacktofile", "-p", "1", "2", "-file", "both.bin"}));
+  EXPECT_THAT(errors(),
+              testing::Each(testing::HasSubstr("readbacktofile writes one file, so it takes one position.\n")));
+}
+
 TEST_F(OperationCallsTest, WithoutACableAnOperationSaysSo) {
   identify();
   manager().closeCable(false);

@@ -99,17 +99,19 @@ TEST(PartLibraryTest, aDamagedFileIsAFailureOfItsPartAlone) {
   EXPECT_THAT(problems, IsEmpty()) << "told once";
 }
 
-TEST(PartLibraryTest, aDirectoryThatIsNotThereIsAFailureOfTheFirstSearch) {
+TEST(PartLibraryTest, aDirectoryThatIsNotThereIsTheFailureOfWhatIsNotFound) {
   PartLibrary library({"/nowhere/parts"});
-  const auto first = library.find("zp18v01");
-  ASSERT_FALSE(first);
-  EXPECT_EQ(first.failure().text, "Cannot read the directory of parts /nowhere/parts: No such file or directory.");
-  EXPECT_TRUE(library.find("zp18v01"));
+  EXPECT_TRUE(library.find("zp18v01")) << "what is built in is there nevertheless";
+  for (int i = 0; i < 2; ++i) {
+    const auto missing = library.find("roach");
+    ASSERT_FALSE(missing);
+    EXPECT_EQ(missing.failure().text, "Cannot read the directory of parts /nowhere/parts: No such file or directory.");
+  }
 
   PartLibrary other({"/nowhere/parts"});
   std::vector<std::string> problems;
   EXPECT_EQ(nameOf(other.identify(idcode(0x5102), &problems)), "zp18v02");
-  EXPECT_THAT(problems, ElementsAre(first.failure().text));
+  EXPECT_THAT(problems, ElementsAre("Cannot read the directory of parts /nowhere/parts: No such file or directory."));
 }
 
 TEST(PartLibraryTest, readsAFileByItsPath) {

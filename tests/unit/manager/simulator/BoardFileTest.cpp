@@ -111,7 +111,7 @@ TEST(BoardFile, MissingFilesAreNamed) {
 
 TEST(BoardFile, TheDefaultBoardIsTheExample) {
   PartLibrary parts;
-  const auto board = SimulatedBoard::makeDefault(parts);
+  const auto board = SimulatedBoard::makeDefault();
   ASSERT_EQ(board->devices(), 3U);
   EXPECT_EQ(board->name(), "default");
   EXPECT_EQ(board->lockName(), "");
