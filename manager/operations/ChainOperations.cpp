@@ -65,6 +65,8 @@ void keepDescription(DeviceChain& before, std::vector<ChainDevice>& devices) {
 }
 
 Status identify(OperationContext& context, const UT_CMDARGS& /*args*/) {
+  if (context.mode == tESSELNS::SPI)
+    return Failure{"identify finds TAPs; in this mode name the SPI flash with addDevice -part."};
   if (context.cable.recordsOnly()) return Failure{"identify needs a cable that reads, this one only records."};
   reportStatus("Identifying chain contents...\n");
   const Result<ChainScan::Found> found = ChainScan::find(context.cable);

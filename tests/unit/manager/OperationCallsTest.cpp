@@ -182,7 +182,10 @@ TEST_F(OperationCallsTest, TheModeOfSpiFlashReachesItBehindTheBridge) {
   EXPECT_TRUE(perform({"program", "-p", "0", "-e", "-v", "-data", "CAFE"}));
   EXPECT_TRUE(perform({"verify", "-p", "0", "-data", "CAFE"}));
   EXPECT_FALSE(perform({"readidcode", "-p", "0"}));
-  EXPECT_THAT(errors(), ElementsAre("'1': SPI flash can't do readidcode.\n"));
+  EXPECT_FALSE(perform({"identify"}));
+  EXPECT_THAT(errors(), ElementsAre("'1': SPI flash can't do readidcode.\n",
+                                    "identify finds TAPs; in this mode name the SPI flash with addDevice -part.\n"));
+  EXPECT_EQ(manager().getDeviceChainCount(), 1);
 }
 
 TEST_F(OperationCallsTest, ProgressIsAPercentageThatGrows) {
