@@ -1,5 +1,5 @@
 #!/usr/bin/env bash
-# Runs clang-tidy over the C++ files that preset dev compiles, or over those whose path holds one of the given
+# Runs clang-tidy over the C++ files of the tree that preset dev compiles, or over those whose path holds one of the given
 # texts. The checks stand in .clang-tidy; each finding is an error.
 #   scripts/tidy.sh
 #   scripts/tidy.sh batch/settings portability/Stream.cpp
@@ -18,7 +18,7 @@ if [[ $# -gt 0 ]]; then
   for text in "$@"; do wanted+=(-e "$text"); done
 fi
 mapfile -t files < <(sed -n 's/^  "file": "\(.*\)",\{0,1\}$/\1/p' "$root/build/dev/compile_commands.json" |
-  sort -u | grep -F "${wanted[@]}")
+  sort -u | grep -vF "$root/build/" | grep -F "${wanted[@]}")
 [[ ${#files[@]} -gt 0 ]] || fail "No file of preset dev fits: $*"
 
 say "$tidy on ${#files[@]} files"
